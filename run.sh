@@ -6,7 +6,7 @@ set -euo pipefail
 cd "$(dirname "$0")"
 source scripts/deps.sh
 tb_install_packages "${TB_BUILD_PACKAGES[@]}"
-tb_build build -DTB_BENCH=OFF >/dev/null
+tb_build build >/dev/null
 
 example=resources/examples/globins.fa
 if [ -n "${DISPLAY:-}${WAYLAND_DISPLAY:-}" ] && [ -x build/app/tiler-blocks ]; then
