@@ -1,0 +1,58 @@
+#pragma once
+// Phase two of the search: the maximal multi-molecule diagonals grown from one hit.
+//
+// A diagonal is a set of placements (molecule, offset) in which every two members have a hit at
+// their relative offset, that is a clique of the graph whose vertices are placements. The
+// diagonals kept for hit (i, j, d) are the maximal cliques that hold (i, 0) and (j, d) and whose
+// other members are molecules above j, with at least the minimum number of members. They are
+// enumerated with Bron-Kerbosch (with pivoting): candidates are the placements of molecules
+// above j that agree with the hit, and placements of the other molecules below j that agree
+// with it only stop a clique from being maximal. The cliques of one hit are returned ordered by
+// their (member, offset) sequences, the order in which a depth-first expansion that adds
+// molecules in increasing order, and offsets in increasing order, would keep them.
+
+#include <cstdint>
+#include <functional>
+#include <vector>
+
+#include "SimDiag.h"
+#include "search/HitMasks.h"
+
+class CDiagonalExpander {
+  public:
+    // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order.
+    CDiagonalExpander(const CHitMasks& masks,
+                      const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
+                      int minSequences);
+
+    // Appends the diagonals of `hit` to `kept`. `shouldAbort` is asked at every step of the
+    // search; when it answers true nothing more is appended and the result is false.
+    bool Expand(const CSimHit& hit, const std::function<bool()>& shouldAbort,
+                std::vector<CSimDiag>& kept);
+
+  private:
+    struct CPlacement {
+        int molecule;
+        std::int32_t offset;
+    };
+    using CVertexSet = std::vector<std::uint64_t>;
+
+    void CollectPlacements(const CSimHit& hit);
+    void BuildAdjacency();
+    bool Search(std::vector<int>& clique, CVertexSet candidates, CVertexSet excluded);
+    int ChoosePivot(const CVertexSet& candidates, const CVertexSet& excluded) const;
+    void Report(const std::vector<int>& clique);
+
+    const CHitMasks& m_masks;
+    const std::vector<std::vector<std::vector<std::int32_t>>>& m_pairOffsets;
+    int m_minSequences;
+
+    // State of the hit being expanded.
+    CSimHit m_hit;
+    const std::function<bool()>* m_shouldAbort = nullptr;
+    std::vector<CPlacement> m_placements;  // candidates first, then the excluded ones
+    int m_candidateCount = 0;
+    std::size_t m_words = 0;
+    std::vector<std::uint64_t> m_adjacency;  // m_words per placement
+    std::vector<CSimDiag> m_found;
+};
