@@ -124,6 +124,9 @@ class CScoreMatrix : public CSerializable {
   private:
     // Sizes the table for the current alphabet, every cell 0.
     void ResetScores();
+    // Reads the scores of row `row` from a row line; false (with m_lastError) on a line with
+    // more values than letters or a score beyond 32 bits.
+    bool ReadRow(int row, std::string_view line);
 
     std::string m_name;
     std::string m_alphabet;

@@ -63,8 +63,8 @@ class CStatTable : public CSerializable {
     // Appends the statistics section of a matrix text file to `out` (nothing when empty).
     void AppendText(std::string& out) const;
     // Reads one statistics line ("m lambda K [*]", split at blanks, commas and tabs) and sets
-    // its entry. Lines with fewer than three tokens, or whose first three tokens are not
-    // numbers, are ignored; returns whether an entry was set.
+    // its entry; a fourth token containing "*" marks it. Lines with fewer than three tokens,
+    // or whose m does not fit 32 bits, are ignored; returns whether an entry was set.
     bool ReadTextLine(std::string_view line);
 
     void Serialize(CArchive& ar) override;
