@@ -1,0 +1,7 @@
+#include "ShellResources.h"
+
+#include <QtGlobal>
+
+void InitShellResources() {
+    Q_INIT_RESOURCE(tiler_blocks);
+}
