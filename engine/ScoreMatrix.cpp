@@ -103,6 +103,13 @@ bool CScoreMatrix::LoadBuiltin(const std::string& name, std::int32_t type) {
     return true;
 }
 
+bool CScoreMatrix::LoadBuiltinOrFile(const std::string& nameOrPath) {
+    if (const CBuiltinMatrix* table = FindBuiltinMatrix(nameOrPath)) {
+        return LoadBuiltin(nameOrPath, table->type);
+    }
+    return ReadTextFile(nameOrPath);
+}
+
 bool CScoreMatrix::SetAlphabet(const std::string& letters) {
     if (letters.size() > kMaxLetters)
         return false;

@@ -42,6 +42,10 @@ class CScoreMatrix : public CSerializable {
     // the scores are all 0, the name is unchanged, and the result is false.
     bool LoadBuiltin(const std::string& name, std::int32_t type);
 
+    // `nameOrPath` as a built-in name (with the table's own type) or else as a matrix text
+    // file (see ReadTextFile). False, with LastError() and the matrix unchanged, when neither.
+    bool LoadBuiltinOrFile(const std::string& nameOrPath);
+
     // Replaces the alphabet, keeping cells at the same row and column index and zero-filling
     // new ones. True when the alphabet is not empty.
     bool SetAlphabet(const std::string& letters);
