@@ -43,6 +43,7 @@ void CSxQualifier::Serialize(CArchive& ar) {
     ar.XMember(name);
     ar.XMember(value);
     ar.XMember(hasValue);
+    ar.XMember(quoted);
 }
 
 void CSxFeature::SetLocation(const std::string& text) {

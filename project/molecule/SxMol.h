@@ -35,9 +35,10 @@ struct CSxReference {
 };
 
 struct CSxQualifier {
-    std::string name;   // without the leading '/'
-    std::string value;  // unquoted; empty for a qualifier without value
-    bool hasValue = true;
+    std::string name;      // without the leading '/'
+    std::string value;     // without quotes; empty for a qualifier without value
+    bool hasValue = true;  // "/name=value" rather than "/name"
+    bool quoted = true;    // the value is written in double quotes
 
     void Serialize(CArchive& ar);
     bool operator==(const CSxQualifier&) const = default;
