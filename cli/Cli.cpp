@@ -9,6 +9,7 @@ int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream
     app.require_subcommand(1);
     CCliContext context{out, err, errIsTerminal};
     AddMatrixCommands(app, context);
+    AddMoleculeCommands(app, context);
 
     std::vector<std::string> reversed(args.rbegin(), args.rend());
     try {

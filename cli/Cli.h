@@ -33,6 +33,7 @@ struct CCliContext {
 // Each command group adds its subcommands to the application; their callbacks write through
 // the context and throw CCliError on failure.
 void AddMatrixCommands(CLI::App& app, CCliContext& context);
+void AddMoleculeCommands(CLI::App& app, CCliContext& context);
 
 // Parses `args` (without the program name) and runs the command; returns the exit status.
 int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream& err,

@@ -124,6 +124,7 @@ int CEmblParser::ReadHeader(const std::string& line) {
         name.pop_back();
     if (name.empty())
         return kNoName;
+    std::replace(name.begin(), name.end(), '\\', ' ');
     m_mol.SetName(name);
     if (int result = ApplyHeaderWords(m_mol, tokens))
         return result;

@@ -173,8 +173,13 @@ void CGenBankParser::ReadSequence() {
 }
 
 void CGenBankParser::AddLine(const std::string& line) {
-    if (IsBlankLine(line))
+    if (IsBlankLine(line)) {
+        // Comments keep their empty lines; elsewhere blank lines mean nothing.
+        if (!m_inFeatures && !m_sections.empty() && m_sections.back().keyword == "COMMENT") {
+            m_sections.back().lines.push_back("");
+        }
         return;
+    }
     std::vector<std::string> tokens = SplitTokens(line);
     if (line[0] != ' ') {
         m_inFeatures = tokens[0] == "FEATURES";
