@@ -127,6 +127,26 @@ public:
         EndRecord();
     }
 
+    // An embedded object whose own format errors stay inside its record: on reading, an archive
+    // error raised by the object's members skips the rest of its record and the result is false
+    // (the object is then half-read and must be replaced). Errors in the record's framing throw.
+    template <class T>
+    bool XDataContained(T& object) {
+        BeginRecord();
+        const std::size_t depth = m_recordEnds.size();
+        try {
+            object.Serialize(*this);
+        } catch (const CArchiveException&) {
+            if (IsStoring()) throw;
+            m_recordEnds.resize(depth);
+            m_pos = m_recordEnds.back();
+            m_recordEnds.pop_back();
+            return false;
+        }
+        EndRecord();
+        return true;
+    }
+
     // An owned object pointer, stored with its class tag (or as a null pointer). On reading,
     // an object of the stored class is created; it must be a T.
     template <class T>
