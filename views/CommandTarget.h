@@ -8,6 +8,7 @@
 struct CCommandState {
     bool enabled = true;
     bool checked = false;
+    bool visible = true;
     QString text;  // a replacement menu text; empty keeps the table's text
 };
 

@@ -1,0 +1,51 @@
+#pragma once
+// Residue selections exchanged with sibling programs: one record in the shared memory named
+// "QRBO_BROADCAST_FILE_NAME" (guarded by its system semaphore), announced by a signal on the
+// D-Bus session bus when there is one.
+
+#include <QObject>
+#include <QSharedMemory>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+struct CBroadcastRecord {
+    std::int32_t sender = 0;  // the sending program's id
+    std::string molecule;
+    std::int32_t kind = 2;  // 2: protein
+    std::int32_t first = 0;
+    std::int32_t last = 0;
+    std::int32_t reserved = 0;
+};
+
+class CSelectionBroadcast : public QObject {
+    Q_OBJECT
+  public:
+    static constexpr char kSharedMemoryName[] = "QRBO_BROADCAST_FILE_NAME";
+    static constexpr int kSharedMemorySize = 4096;
+
+    explicit CSelectionBroadcast(QObject* parent = nullptr);
+
+    // This program's sender id.
+    std::int32_t OwnSender() const;
+    // Writes the record (with this program as sender) and announces it.
+    bool Write(CBroadcastRecord record);
+    // The record in shared memory; a record this program sent reads as an empty name.
+    std::optional<CBroadcastRecord> Read();
+
+    static std::vector<std::uint8_t> Encode(const CBroadcastRecord& record);
+    static std::optional<CBroadcastRecord> Decode(const std::uint8_t* data, std::size_t size);
+
+  signals:
+    // Another program announced a record.
+    void announced();
+
+  private slots:
+    void OnNotify(int sender);
+
+  private:
+    bool Attach();
+
+    QSharedMemory m_memory;
+};
