@@ -1,5 +1,6 @@
 // tiler-blocks-cli matrix list|show|info: the built-in and file score matrices.
 
+#include <filesystem>
 #include <memory>
 #include <ostream>
 
@@ -12,13 +13,15 @@ namespace {
 // The matrix named by a built-in name or, failing that, a file path.
 CScoreMatrix LoadMatrix(const std::string& nameOrPath) {
     CScoreMatrix matrix;
-    if (!matrix.LoadBuiltinOrFile(nameOrPath)) {
-        throw CCliError(kCliBadInput,
-                        "tiler-blocks-cli: no built-in matrix or readable matrix "
-                        "file \"" +
-                            nameOrPath + "\": " + matrix.LastError());
+    if (matrix.LoadBuiltinOrFile(nameOrPath))
+        return matrix;
+    std::error_code ignored;
+    if (!std::filesystem::exists(nameOrPath, ignored)) {
+        throw CCliError(kCliBadInput, "tiler-blocks-cli: \"" + nameOrPath +
+                                          "\" is neither a built-in matrix nor a file");
     }
-    return matrix;
+    throw CCliError(kCliBadInput,
+                    "tiler-blocks-cli: matrix file \"" + nameOrPath + "\": " + matrix.LastError());
 }
 
 std::string TypeName(std::int32_t type) {

@@ -129,10 +129,6 @@ TEST(MatrixCli, InfoGivesCutoffsAndWindowScore) {
         EXPECT_EQ(info["statistics"], "none");
     }
     EXPECT_EQ(InfoOf(Matrix({"info", "blosum62mt"}).out)["expected window score"], "-2");
-    EXPECT_EQ(InfoOf(Matrix({"info", "blosum62mt"}).out)["default cutoff"], "33");
-    EXPECT_EQ(InfoOf(Matrix({"info", "blosum62mt2"}).out)["default cutoff"], "66");
-    EXPECT_EQ(InfoOf(Matrix({"info", "blosum80mt"}).out)["default cutoff"], "48");
-    EXPECT_EQ(InfoOf(Matrix({"info", "idmat"}).out)["default cutoff"], "30");
 }
 
 TEST(MatrixCli, FilesAreShownAsTheWriterWritesThem) {
