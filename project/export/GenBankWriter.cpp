@@ -33,7 +33,9 @@ std::string LocusLine(const CSxMol& molecule) {
     if (protein) {
         line += "            linear  ";
     } else {
-        std::string type = desc.moleculeType.empty() ? "DNA" : desc.moleculeType;
+        // LOCUS holds one word: "genomic DNA" is written as "DNA".
+        std::string type = desc.moleculeType.substr(desc.moleculeType.find_last_of(' ') + 1);
+        if (type.empty()) type = "DNA";
         std::snprintf(text, sizeof text, "    %-7s %-8s", type.c_str(),
                       molecule.IsLinear() ? "linear" : "circular");
         line += text;

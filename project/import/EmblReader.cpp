@@ -128,13 +128,14 @@ int CEmblParser::ReadHeader(const std::string& line) {
     m_mol.SetName(name);
     if (int result = ApplyHeaderWords(m_mol, tokens))
         return result;
-    // "ID   X56734; SV 1; linear; mRNA; STD; PLN; 1859 BP." or "ID   HSHBA1 standard; DNA;
-    // HUM; 1000 BP.": the molecule type and the division are pieces between ';'.
+    // EMBL: "ID   X56734; SV 1; linear; mRNA; STD; PLN; 1859 BP." or "ID   HSHBA1 standard;
+    // DNA; HUM; 1000 BP.": the molecule type and the division are pieces between ';'.
+    // SWISS-PROT headers name neither.
+    if (m_mol.Kind() != kKindNucleic)
+        return 0;
     for (const std::string& piece : SplitList(TextOf(line), ';')) {
-        if (m_mol.Kind() == kKindNucleic && m_desc.moleculeType.empty() &&
-            (Contains(piece, "DNA") || Contains(piece, "RNA"))) {
+        if (m_desc.moleculeType.empty() && (Contains(piece, "DNA") || Contains(piece, "RNA")))
             m_desc.moleculeType = piece;
-        }
         if (IsDivision(piece))
             m_desc.division = piece;
     }

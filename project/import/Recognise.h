@@ -5,6 +5,7 @@
 #include <string_view>
 #include <vector>
 
+#include "UserPrompt.h"  // MoleculeType
 #include "import/SxStream.h"
 
 // Format codes.
