@@ -414,8 +414,8 @@ TEST(ScoreMatrixArchive, RoundTripKeepsEverythingStored) {
     EXPECT_EQ(k, 0.02);
 }
 
-namespace {
-// A matrix record as older files hold it: name, alphabet and scores only.
+// A matrix record as older files hold it: name, alphabet and scores only. (Outside the
+// anonymous namespace: clang flags an unused class tag there.)
 struct OldMatrixRecord : CSerializable {
     TB_CLASS_TAG("ScoreMatrix")
     void Serialize(CArchive& ar) override {
@@ -427,7 +427,6 @@ struct OldMatrixRecord : CSerializable {
             ar.XMember(score);
     }
 };
-}  // namespace
 
 TEST(ScoreMatrixArchive, OlderRecordsReadWithoutTypeAndStatistics) {
     OldMatrixRecord old;
@@ -470,7 +469,6 @@ TEST(ScoreMatrixArchive, DamagedRecordsAreRefusedAndLeaveTheMatrix) {
     }
 }
 
-namespace {
 // A matrix record whose alphabet would make a table of 10^10 cells.
 struct OverlongMatrixRecord : CSerializable {
     TB_CLASS_TAG("ScoreMatrix")
@@ -481,7 +479,6 @@ struct OverlongMatrixRecord : CSerializable {
         ar.XMember(alphabet);
     }
 };
-}  // namespace
 
 TEST(ScoreMatrixArchive, OverlongAlphabetIsAFormatError) {
     OverlongMatrixRecord huge;
