@@ -13,6 +13,8 @@ class CLinkHistory {
     // Deep copies; the copy's position designates the corresponding snapshot.
     CLinkHistory(const CLinkHistory& other);
     CLinkHistory& operator=(const CLinkHistory& other);
+    CLinkHistory(CLinkHistory&&) noexcept = default;
+    CLinkHistory& operator=(CLinkHistory&&) noexcept = default;
 
     // Drops every snapshot after the position, appends a copy of `links` and moves there.
     void Push(const CLinkList& links);

@@ -1,0 +1,127 @@
+#include "QuilterParams.h"
+
+#include <filesystem>
+#include <memory>
+
+#include "archive/FileIO.h"
+
+namespace {
+
+// Templates are small; anything larger is not one of ours.
+constexpr std::size_t kMaxTemplateBytes = std::size_t{64} << 20;
+
+}  // namespace
+
+CQuilterParams::CQuilterParams() {
+    SetDefaults();
+}
+
+void CQuilterParams::SetDefaults() {
+    m_matrix = CScoreMatrix::Default();
+    SetCutoffFromMatrix();
+    m_minSequences = kDefaultMinSequences;
+    m_expectationLimit = kDefaultExpectationLimit;
+    m_textColour = kNoColour;
+    m_linkedTextColour = kNoColour;
+}
+
+void CQuilterParams::SetCutoffFromMatrix() {
+    if (std::optional<int> cutoff = m_matrix.DefaultCutoff())
+        m_cutoff = *cutoff;
+}
+
+void CQuilterParams::SetPalette(std::vector<std::uint32_t> colours) {
+    m_palette.assign(colours.begin(), colours.end());
+}
+
+std::uint32_t CQuilterParams::BlockColour(int index) const {
+    if (m_palette.empty())
+        return kEmptyPaletteColour;
+    const int size = static_cast<int>(m_palette.size());
+    return m_palette[((index % size) + size) % size];
+}
+
+std::string CQuilterParams::NotTemplateMessage(const std::string& path) {
+    return "File '" + path + "' is not a quilter template";
+}
+
+std::string CQuilterParams::TemplateFileErrorMessage(const std::string& path) {
+    return "Error opening template '" + path + "' file";
+}
+
+std::string CQuilterParams::TemplateFormatErrorMessage(const std::string& path) {
+    return "Error loading alignment template '" + path + "'";
+}
+
+bool CQuilterParams::LoadTemplate(const std::string& path, IUserPrompt* prompt) {
+    std::string failure;
+    std::error_code error;
+    if (!std::filesystem::exists(path, error)) {
+        failure = TemplateFileErrorMessage(path);
+    } else {
+        try {
+            const std::vector<std::uint8_t> bytes = ReadWholeFile(path, kMaxTemplateBytes);
+            if (CArchive::LeadingString(bytes) == kTemplateTag) {
+                CArchive ar = CArchive::ForReading(bytes);
+                std::string tag;
+                ar.XMember(tag);
+                std::unique_ptr<CQuilterParams> read;
+                ar.XPointer(read);
+                if (!read)
+                    throw CArchiveException(CArchiveException::genericError, "no parameters");
+                *this = *read;
+            } else if (prompt) {
+                prompt->ShowMessage(NotTemplateMessage(path), MessageIcon::exclamation);
+            }
+            SetCutoffFromMatrix();
+            return true;
+        } catch (const CFileException&) {
+            failure = TemplateFileErrorMessage(path);
+        } catch (const CArchiveException&) {
+            failure = TemplateFormatErrorMessage(path);
+        }
+    }
+    if (prompt) {
+        prompt->ShowMessage(failure, MessageIcon::exclamation);
+    } else {
+        SetDefaults();
+    }
+    return false;
+}
+
+std::vector<std::uint8_t> CQuilterParams::TemplateBytes() const {
+    CArchive ar = CArchive::ForWriting();
+    std::string tag = kTemplateTag;
+    ar.XMember(tag);
+    auto copy = std::make_unique<CQuilterParams>(*this);
+    ar.XPointer(copy);
+    return ar.Bytes();
+}
+
+bool CQuilterParams::SaveTemplate(const std::string& path, IUserPrompt& prompt) const {
+    try {
+        WriteFileAtomically(path, TemplateBytes());
+        return true;
+    } catch (const CFileException&) {
+        prompt.ShowMessage(TemplateFileErrorMessage(path), MessageIcon::exclamation);
+        return false;
+    }
+}
+
+void CQuilterParams::Serialize(CArchive& ar) {
+    ar.XMember(m_cutoff);
+    ar.XMember(m_minSequences);
+    ar.XMember(m_expectationLimit);
+    ar.XMember(m_textColour);
+    ar.XMember(m_linkedTextColour);
+    ar.XData(m_palette);
+    if (!ar.XDataContained(m_matrix) || (ar.IsLoading() && !m_matrix.IsValid())) {
+        m_matrix = CScoreMatrix::Default();
+    }
+    if (ar.IsLoading() && (m_cutoff < kMinCutoff || m_minSequences < kMinMinSequences)) {
+        throw CArchiveException(CArchiveException::genericError,
+                                "search values below their limits");
+    }
+}
+
+TB_REGISTER_CLASS(CQuilterParams);
