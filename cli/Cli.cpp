@@ -10,6 +10,7 @@ int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream
     CCliContext context{out, err, errIsTerminal};
     AddMatrixCommands(app, context);
     AddMoleculeCommands(app, context);
+    AddProjectCommands(app, context);
 
     std::vector<std::string> reversed(args.rbegin(), args.rend());
     try {

@@ -34,6 +34,7 @@ struct CCliContext {
 // the context and throw CCliError on failure.
 void AddMatrixCommands(CLI::App& app, CCliContext& context);
 void AddMoleculeCommands(CLI::App& app, CCliContext& context);
+void AddProjectCommands(CLI::App& app, CCliContext& context);
 
 // Parses `args` (without the program name) and runs the command; returns the exit status.
 int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream& err,

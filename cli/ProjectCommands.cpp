@@ -1,0 +1,242 @@
+// tiler-blocks-cli info|msf|link|unlink|define-block: reading a saved project, exporting its
+// alignment, and the alignment pane's link, unlink and define-block operations on a selection
+// given as --rows NAME:FIRST-LAST (1-based display columns, inclusive).
+
+#include <cstdio>
+#include <memory>
+#include <ostream>
+
+#include "BlockProject.h"
+#include "BlockSignificance.h"
+#include "Cli.h"
+#include "archive/FileIO.h"
+
+namespace {
+
+// Messages go to stderr; projects are never asked to import raw sequences here.
+class CProjectPrompt : public IUserPrompt {
+  public:
+    explicit CProjectPrompt(std::ostream& err) : m_err(err) {}
+    void ShowMessage(const std::string& text, MessageIcon) override { m_err << text << "\n"; }
+    int AskRawSequenceType(const std::string&, int) override { return kTypeUnknown; }
+
+  private:
+    std::ostream& m_err;
+};
+
+std::string Printf(const char* format, double value) {
+    char text[64];
+    std::snprintf(text, sizeof text, format, value);
+    return text;
+}
+
+std::unique_ptr<CBlockProject> LoadProject(const std::string& path) {
+    std::unique_ptr<CBlockProject> project;
+    try {
+        project = CBlockProject::Load(path);
+    } catch (const CFileException& e) {
+        throw CCliError(kCliBadInput, std::string("tiler-blocks-cli: ") + e.what());
+    } catch (const CArchiveException& e) {
+        throw CCliError(kCliBadInput, e.Report(path));
+    }
+    if (!project)
+        throw CCliError(kCliBadInput, path + " is not a block project");
+    return project;
+}
+
+void SaveProject(const CBlockProject& project, const std::string& path) {
+    try {
+        project.Save(path);
+    } catch (const CFileException& e) {
+        throw CCliError(kCliBadInput, std::string("tiler-blocks-cli: ") + e.what());
+    }
+}
+
+const char* SignificanceWord(int state) {
+    switch (state) {
+        case kSignificant:
+            return "yes";
+        case kNotSignificant:
+            return "no";
+        default:
+            return "n/a";
+    }
+}
+
+// One row of the block table, as the search command prints it.
+std::string BlockTableLine(const CBlockProject& project, int index) {
+    const CSimBlockSet& set = project.BlockSet();
+    const CSimBlock& block = *set.BlockAt(index);
+    constexpr CSimBlock::Layout kLayout = CSimBlock::kCurrent;
+    const CBlockSignificance significance = EvaluateBlockSignificance(
+        block, &set, project.Params().Matrix(), project.Params().ExpectationLimit(), kLayout);
+    std::string members;
+    for (int i = 0; i < block.MemberCount(); ++i) {
+        const CSxMolEntry* entry = set.MoleculeAt(block.Member(i));
+        if (!block.IsIncluded(i) || !entry)
+            continue;
+        if (!members.empty())
+            members += ",";
+        members += entry->Name() + ":" + std::to_string(block.Start(kLayout, i) + 1);
+    }
+    return std::to_string(index + 1) + "\t" + block.Name() + "\t" +
+           std::to_string(block.SequenceCount(kLayout)) + "\t" +
+           std::to_string(block.Width(kLayout)) + "\t" +
+           Printf("%.1f", block.MeanPairScore(kLayout)) + "\t" +
+           std::to_string(block.Score(kLayout)) + "\t" + SignificanceWord(significance.state) +
+           "\t" + Printf("%.3e", significance.p) + "\t" +
+           std::to_string(block.LowestStart(kLayout) + 1) + "\t" + members;
+}
+
+void PrintInfo(const CBlockProject& project, std::ostream& out) {
+    const CQuilterParams& params = project.Params();
+    out << "# parameters\n"
+        << "matrix\t" << params.Matrix().Name() << "\n"
+        << "cutoff\t" << params.Cutoff() << "\n"
+        << "min-seqs\t" << params.MinSequences() << "\n"
+        << "evalue\t" << Printf("%g", params.ExpectationLimit()) << "\n";
+    out << "# molecules\n";
+    for (int i = 0; i < project.MoleculeCount(); ++i) {
+        out << project.MoleculeAt(i)->Name() << "\t" << project.MoleculeAt(i)->SequenceLength()
+            << "\n";
+    }
+    out << "# blocks\n"
+        << "#block\tname\tm\tlen\tMP-score\tSP-score\tSignif.\tP\tOffset\tmembers\n";
+    for (int b = 0; b < project.BlockSet().BlockCount(); ++b) {
+        out << BlockTableLine(project, b) << "\n";
+    }
+    // Each link: its first display column and, per molecule, the residues it holds (1-based).
+    out << "# links\n";
+    for (const auto& link : project.Links()) {
+        out << link->Column() + 1 << "\t";
+        for (int k = 0; k < link->MoleculeCount(); ++k) {
+            const CSxMolEntry* entry = project.BlockSet().MoleculeAt(link->Molecule(k));
+            out << (k ? "," : "") << (entry ? entry->Name() : "?") << ":" << link->Position(k) + 1
+                << "-" << link->Position(k) + link->Length(k);
+        }
+        out << "\n";
+    }
+}
+
+void ExportMsf(const CBlockProject& project, const std::string& path) {
+    CMsfExport msf = project.BuildMsf();
+    if (!msf.IsWritable()) {
+        throw CCliError(kCliBadInput, "tiler-blocks-cli: the project has no aligned molecules");
+    }
+    try {
+        msf.Save(path);
+    } catch (const CFileException&) {
+        throw CCliError(kCliBadInput, MsfWriteErrorMessage(path));
+    }
+}
+
+// "NAME:FIRST-LAST" (1-based, inclusive, either order) as columns [FIRST - 1, LAST).
+ALN_BSEL_ENTRY ParseRow(const std::string& text) {
+    const std::size_t colon = text.rfind(':');
+    const std::size_t dash = colon == std::string::npos ? colon : text.find('-', colon);
+    int first = 0;
+    int last = 0;
+    std::size_t used = 0;
+    try {
+        if (dash == std::string::npos)
+            throw std::invalid_argument(text);
+        first = std::stoi(text.substr(colon + 1, dash - colon - 1), &used);
+        if (used != dash - colon - 1)
+            throw std::invalid_argument(text);
+        last = std::stoi(text.substr(dash + 1), &used);
+        if (used != text.size() - dash - 1)
+            throw std::invalid_argument(text);
+    } catch (const std::exception&) {
+        throw CCliError(kCliBadInput,
+                        "tiler-blocks-cli: --rows wants NAME:FIRST-LAST, not '" + text + "'");
+    }
+    if (first < 1 || last < 1) {
+        throw CCliError(kCliBadInput, "tiler-blocks-cli: columns start at 1 in '" + text + "'");
+    }
+    return {text.substr(0, colon), std::min(first, last) - 1, std::max(first, last)};
+}
+
+struct CSelectionOptions {
+    std::string project;
+    std::vector<std::string> rows;
+    std::string output;
+};
+
+enum class SelectionOperation { link, unlink, defineBlock };
+
+void RunSelectionOperation(SelectionOperation operation, const CSelectionOptions& options,
+                           CCliContext& context) {
+    std::unique_ptr<CBlockProject> project = LoadProject(options.project);
+    std::vector<ALN_BSEL_ENTRY> selection;
+    for (const std::string& row : options.rows)
+        selection.push_back(ParseRow(row));
+    // As in the alignment pane, a selection stops at gaps.
+    selection = TrimSelection(project->Layout(), selection);
+    CProjectPrompt prompt(context.err);
+    switch (operation) {
+        case SelectionOperation::link: {
+            std::vector<ALN_BSEL_ENTRY> columns;
+            if (!project->Link(selection, prompt, &columns)) {
+                throw CCliError(kCliBadInput, "tiler-blocks-cli: nothing linked");
+            }
+            for (const ALN_BSEL_ENTRY& entry : columns) {
+                context.out << entry.name << ":" << entry.start + 1 << "-" << entry.end << "\n";
+            }
+            break;
+        }
+        case SelectionOperation::unlink:
+            if (!project->Unlink(selection)) {
+                throw CCliError(kCliBadInput, "tiler-blocks-cli: nothing was linked there");
+            }
+            break;
+        case SelectionOperation::defineBlock: {
+            const CSimBlock* block = project->DefineBlock(selection);
+            if (!block) {
+                throw CCliError(kCliBadInput,
+                                "tiler-blocks-cli: the selection does not make a block");
+            }
+            context.out << BlockTableLine(*project, project->BlockSet().IndexOfBlock(*block))
+                        << "\n";
+            break;
+        }
+    }
+    SaveProject(*project, options.output.empty() ? options.project : options.output);
+}
+
+void AddSelectionCommand(CLI::App& app, CCliContext& context, const std::string& name,
+                         const std::string& description, SelectionOperation operation) {
+    auto options = std::make_shared<CSelectionOptions>();
+    CLI::App* command = app.add_subcommand(name, description);
+    command->add_option("PROJECT", options->project, "Block project (.bpr)")->required();
+    command
+        ->add_option("--rows", options->rows,
+                     "Selected rows as NAME:FIRST-LAST, 1-based display columns, inclusive")
+        ->required()
+        ->delimiter(',');
+    command->add_option("-o", options->output, "Write the changed project here instead");
+    command->callback(
+        [options, operation, &context] { RunSelectionOperation(operation, *options, context); });
+}
+
+}  // namespace
+
+void AddProjectCommands(CLI::App& app, CCliContext& context) {
+    auto infoPath = std::make_shared<std::string>();
+    CLI::App* info =
+        app.add_subcommand("info", "Parameters, molecules, block table and links of a project");
+    info->add_option("PROJECT", *infoPath, "Block project (.bpr)")->required();
+    info->callback([infoPath, &context] { PrintInfo(*LoadProject(*infoPath), context.out); });
+
+    auto msfPaths = std::make_shared<std::pair<std::string, std::string>>();
+    CLI::App* msf = app.add_subcommand("msf", "Writes the project's linked alignment as MSF");
+    msf->add_option("PROJECT", msfPaths->first, "Block project (.bpr)")->required();
+    msf->add_option("OUT", msfPaths->second, "MSF file to write")->required();
+    msf->callback([msfPaths] { ExportMsf(*LoadProject(msfPaths->first), msfPaths->second); });
+
+    AddSelectionCommand(app, context, "link", "Links the selected columns of the rows",
+                        SelectionOperation::link);
+    AddSelectionCommand(app, context, "unlink", "Unlinks the selected columns of the rows",
+                        SelectionOperation::unlink);
+    AddSelectionCommand(app, context, "define-block", "Defines a block on the selected rows",
+                        SelectionOperation::defineBlock);
+}

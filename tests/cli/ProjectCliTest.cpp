@@ -1,0 +1,281 @@
+// tiler-blocks-cli info, msf, link, unlink and define-block on saved projects.
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <sstream>
+
+#include "BlockProject.h"
+#include "Cli.h"
+#include "archive/FileIO.h"
+
+namespace fs = std::filesystem;
+
+namespace {
+
+struct CRun {
+    int status;
+    std::string out;
+    std::string err;
+};
+
+CRun RunTool(const std::vector<std::string>& args) {
+    std::ostringstream out;
+    std::ostringstream err;
+    const int status = RunCli(args, out, err);
+    return {status, out.str(), err.str()};
+}
+
+std::string ReadText(const std::string& path) {
+    const std::vector<std::uint8_t> bytes = ReadWholeFile(path);
+    return std::string(bytes.begin(), bytes.end());
+}
+
+std::vector<std::string> Lines(const std::string& text) {
+    std::vector<std::string> lines;
+    std::istringstream in(text);
+    for (std::string line; std::getline(in, line);)
+        lines.push_back(line);
+    return lines;
+}
+
+// The published GCG checksum, written out independently of the exporter.
+int Gcg(const std::string& sequence) {
+    long sum = 0;
+    for (std::size_t i = 0; i < sequence.size(); ++i) {
+        sum += static_cast<long>(i % 57 + 1) * static_cast<unsigned char>(sequence[i]);
+    }
+    return static_cast<int>(sum % 10000);
+}
+
+// The sequences of an MSF file, gathered from its interleaved lines.
+std::map<std::string, std::string> MsfSequences(const std::string& text) {
+    std::map<std::string, std::string> sequences;
+    bool body = false;
+    for (const std::string& line : Lines(text)) {
+        if (line == "//") {
+            body = true;
+            continue;
+        }
+        std::istringstream words(line);
+        std::string name;
+        if (!body || !(words >> name) || std::isdigit(static_cast<unsigned char>(name[0])))
+            continue;
+        for (std::string group; words >> group;)
+            sequences[name] += group;
+    }
+    return sequences;
+}
+
+class ProjectCli : public ::testing::Test {
+  protected:
+    void SetUp() override {
+        m_dir = fs::temp_directory_path() /
+                ("tb-project-cli-" +
+                 std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()));
+        fs::remove_all(m_dir);
+        fs::create_directories(m_dir);
+    }
+    void TearDown() override { fs::remove_all(m_dir); }
+    std::string Path(const std::string& name) const { return (m_dir / name).string(); }
+
+    // Searches a sequence file and saves the project.
+    std::string SearchedProject(const std::string& fasta, int minSequences) {
+        CBlockProject project;
+        CRecordingPrompt prompt;
+        EXPECT_TRUE(project.AddFile(fasta, prompt));
+        project.Params().SetMinSequences(minSequences);
+        EXPECT_TRUE(project.Search(project.AllMolecules(), RunSearchJob, prompt));
+        const std::string path = Path("searched.bpr");
+        project.Save(path);
+        return path;
+    }
+
+    // --rows for block `index`: its members' residues, which are also their display columns
+    // while nothing is linked before them.
+    static std::string RowsOfBlock(const CBlockProject& project, int index) {
+        const CSimBlock& block = *project.BlockSet().BlockAt(index);
+        const CAlignmentLayout layout = project.Layout();
+        std::string rows;
+        for (const CBlockRowRange& range : BlockRowRanges(layout, block)) {
+            rows += (rows.empty() ? "" : ",") + layout.RowAt(range.row).name + ":" +
+                    std::to_string(range.start + 1) + "-" + std::to_string(range.end);
+        }
+        return rows;
+    }
+
+    fs::path m_dir;
+};
+
+std::string Myoglobins() {
+    return std::string(TB_TEST_DATA_DIR) + "/projects/myoglobins6.fa";
+}
+
+// A real family of 45 globins where the system has it, else the shipped myoglobins.
+std::string GlobinFamily() {
+    const std::string globins = "/usr/share/doc/hmmer/examples/tutorial/globins45.fa";
+    return fs::exists(globins) ? globins : Myoglobins();
+}
+
+TEST_F(ProjectCli, InfoListsParametersMoleculesBlocksAndLinks) {
+    const std::string path = SearchedProject(Myoglobins(), 6);
+    const CRun run = RunTool({"info", path});
+    ASSERT_EQ(run.status, 0) << run.err;
+    const std::vector<std::string> lines = Lines(run.out);
+    ASSERT_GE(lines.size(), 12u);
+    EXPECT_EQ(lines[0], "# parameters");
+    EXPECT_EQ(lines[1], "matrix\tblosum62mt");
+    EXPECT_EQ(lines[2], "cutoff\t33");
+    EXPECT_EQ(lines[3], "min-seqs\t6");
+    EXPECT_EQ(lines[5], "# molecules");
+    EXPECT_EQ(lines[6], "MYG_ESCGI\t153");
+    const std::unique_ptr<CBlockProject> project = CBlockProject::Load(path);
+    const int blocks = project->BlockSet().BlockCount();
+    ASSERT_GT(blocks, 0);
+    auto at = std::find(lines.begin(), lines.end(), "# blocks");
+    ASSERT_NE(at, lines.end());
+    EXPECT_EQ(*(at + 1), "#block\tname\tm\tlen\tMP-score\tSP-score\tSignif.\tP\tOffset\tmembers");
+    // Every block of the first search spans all six myoglobins.
+    const std::string& first = *(at + 2);
+    EXPECT_EQ(first.rfind("1\t\t6\t", 0), 0u) << first;
+    EXPECT_EQ(std::count(first.begin(), first.end(), ','), 5);
+    EXPECT_EQ(lines.back(), "# links");
+}
+
+TEST_F(ProjectCli, LinkTwoBlocksThenExportMsfWithGcgChecksums) {
+    const std::string path = SearchedProject(GlobinFamily(), 5);
+    std::unique_ptr<CBlockProject> project = CBlockProject::Load(path);
+    const int molecules = project->MoleculeCount();
+    // Link block 0, then the first later block that can be linked with it.
+    CRun run = RunTool({"link", path, "--rows", RowsOfBlock(*project, 0)});
+    ASSERT_EQ(run.status, 0) << run.err;
+    int linked = 1;
+    for (int b = 1; b < project->BlockSet().BlockCount() && linked < 2; ++b) {
+        project = CBlockProject::Load(path);
+        run = RunTool({"link", path, "--rows", RowsOfBlock(*project, b)});
+        if (run.status == 0)
+            ++linked;
+    }
+    ASSERT_EQ(linked, 2);
+    project = CBlockProject::Load(path);
+    EXPECT_EQ(project->Links().Count(), 2);
+    // Every linked residue stands in its link's column.
+    const CAlignmentLayout layout = project->Layout();
+    for (const auto& link : project->Links()) {
+        for (int k = 0; k < link->MoleculeCount(); ++k) {
+            const CSegmentRow& row = layout.RowAt(layout.RowOfEntry(link->Molecule(k))).segments;
+            EXPECT_EQ(row.PositionToColumn(link->Position(k)), link->Column());
+        }
+    }
+
+    const std::string msf = Path("out.msf");
+    run = RunTool({"msf", path, msf});
+    ASSERT_EQ(run.status, 0) << run.err;
+    const std::string text = ReadText(msf);
+    const std::map<std::string, std::string> sequences = MsfSequences(text);
+    ASSERT_EQ(static_cast<int>(sequences.size()), molecules);
+    int total = 0;
+    for (const auto& [name, sequence] : sequences) {
+        EXPECT_EQ(static_cast<int>(sequence.size()), layout.ColumnCount());
+        const int check = Gcg(sequence);
+        total += check;
+        EXPECT_NE(text.find(" Name: " + name + " \tLen: " + std::to_string(layout.ColumnCount()) +
+                            "\tCheck: " + std::to_string(check) + "\tWeight: 0\n"),
+                  std::string::npos)
+            << name;
+        // The aligned text is the alignment's, in upper case with '.' for gaps.
+        std::string shown = layout.DisplaySeqOf(layout.IndexOfRow(name)).Text();
+        shown.resize(layout.ColumnCount(), '-');
+        for (char& c : shown)
+            c = c == '-' ? '.' : static_cast<char>(std::toupper(c));
+        EXPECT_EQ(sequence, shown);
+    }
+    EXPECT_NE(text.find("Check: " + std::to_string(total % 10000) + "   ..\n"), std::string::npos);
+
+    if (std::system("command -v seqret > /dev/null 2>&1") != 0)
+        GTEST_SKIP() << "no EMBOSS";
+    const std::string fasta = Path("back.fa");
+    const std::string command = "seqret -auto -sformat msf -sequence '" + msf +
+                                "' -osformat fasta -outseq '" + fasta + "' 2>/dev/null";
+    ASSERT_EQ(std::system(command.c_str()), 0);
+    std::map<std::string, std::string> readBack;
+    std::string current;
+    for (const std::string& line : Lines(ReadText(fasta))) {
+        if (!line.empty() && line[0] == '>') {
+            current = line.substr(
+                1, line.find(' ') == std::string::npos ? std::string::npos : line.find(' ') - 1);
+            continue;
+        }
+        readBack[current] += line;
+    }
+    ASSERT_EQ(readBack.size(), sequences.size());
+    for (const auto& [name, sequence] : sequences) {
+        std::string expected = sequence;
+        std::replace(expected.begin(), expected.end(), '.', '-');
+        EXPECT_EQ(readBack[name], expected) << name;
+    }
+}
+
+TEST_F(ProjectCli, UnlinkDefineBlockAndOutputFile) {
+    const std::string path = SearchedProject(Myoglobins(), 6);
+    const std::unique_ptr<CBlockProject> project = CBlockProject::Load(path);
+    const std::string rows = RowsOfBlock(*project, 0);
+    const std::string linked = Path("linked.bpr");
+    CRun run = RunTool({"link", path, "--rows", rows, "-o", linked});
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_TRUE(CBlockProject::Load(path)->Links().IsEmpty());
+    EXPECT_EQ(CBlockProject::Load(linked)->Links().Count(), 1);
+
+    run = RunTool({"unlink", linked, "--rows", rows});
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_TRUE(CBlockProject::Load(linked)->Links().IsEmpty());
+    run = RunTool({"unlink", linked, "--rows", rows});
+    EXPECT_EQ(run.status, 2);
+
+    // Two rows, columns 1-10 and 3-12: a block of width 10 named ud1.
+    const std::string first = project->MoleculeAt(0)->Name();
+    const std::string second = project->MoleculeAt(1)->Name();
+    run = RunTool({"define-block", linked, "--rows", first + ":1-10," + second + ":12-3"});
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_NE(run.out.find("\tud1\t2\t10\t"), std::string::npos) << run.out;
+    EXPECT_NE(run.out.find(first + ":1," + second + ":3"), std::string::npos) << run.out;
+    EXPECT_EQ(CBlockProject::Load(linked)->BlockSet().BlockCount(),
+              project->BlockSet().BlockCount() + 1);
+}
+
+TEST_F(ProjectCli, BadInputIsRefusedAndLeavesTheProjectFileAlone) {
+    const std::string path = SearchedProject(Myoglobins(), 6);
+    const std::string before = ReadText(path);
+    const std::unique_ptr<CBlockProject> project = CBlockProject::Load(path);
+    const std::string name = project->MoleculeAt(0)->Name();
+
+    for (const std::string& rows : {name + ":5", name + ":a-9", name + ":0-4", name + "-4"}) {
+        const CRun run = RunTool({"link", path, "--rows", rows});
+        EXPECT_EQ(run.status, 2) << rows;
+        EXPECT_TRUE(run.err.find("--rows wants NAME:FIRST-LAST") != std::string::npos ||
+                    run.err.find("columns start at 1") != std::string::npos)
+            << run.err;
+    }
+    // A crossing link is refused with the program's message.
+    const std::string other = project->MoleculeAt(1)->Name();
+    ASSERT_EQ(RunTool({"link", path, "--rows", name + ":1-5," + other + ":1-5"}).status, 0);
+    const std::string linked = ReadText(path);
+    const CRun crossing = RunTool({"link", path, "--rows", name + ":20-24," + other + ":1-3"});
+    EXPECT_EQ(crossing.status, 2);
+    EXPECT_NE(crossing.err.find("Block can not be linked.\n"), std::string::npos);
+    EXPECT_EQ(ReadText(path), linked);
+
+    std::ofstream(Path("cut.bpr"), std::ios::binary) << before.substr(0, before.size() / 2);
+    CRun run = RunTool({"info", Path("cut.bpr")});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_NE(run.err.find("Unexpected end of file."), std::string::npos) << run.err;
+    run = RunTool({"msf", Myoglobins(), Path("x.msf")});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_NE(run.err.find("is not a block project"), std::string::npos);
+    EXPECT_FALSE(fs::exists(Path("x.msf")));
+}
+
+}  // namespace
