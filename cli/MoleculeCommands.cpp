@@ -34,7 +34,7 @@ class CCliPrompt : public IUserPrompt {
         }
         if (presetType != kTypeUnknown && presetType != m_rawType) {
             m_err << "Unrecognized file format: " << path << "\n"
-                  << "The molecules read so far are of the other type than --raw names.\n";
+                  << "--raw names the other molecule type than the molecule list holds.\n";
             return kTypeUnknown;
         }
         return m_rawType;
