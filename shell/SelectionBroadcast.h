@@ -6,18 +6,8 @@
 #include <QObject>
 #include <QSharedMemory>
 #include <cstdint>
-#include <optional>
-#include <string>
-#include <vector>
 
-struct CBroadcastRecord {
-    std::int32_t sender = 0;  // the sending program's id
-    std::string molecule;
-    std::int32_t kind = 2;  // 2: protein
-    std::int32_t first = 0;
-    std::int32_t last = 0;
-    std::int32_t reserved = 0;
-};
+#include "BroadcastRecord.h"
 
 class CSelectionBroadcast : public QObject {
     Q_OBJECT
@@ -31,11 +21,9 @@ class CSelectionBroadcast : public QObject {
     std::int32_t OwnSender() const;
     // Writes the record (with this program as sender) and announces it.
     bool Write(CBroadcastRecord record);
-    // The record in shared memory; a record this program sent reads as an empty name.
-    std::optional<CBroadcastRecord> Read();
-
-    static std::vector<std::uint8_t> Encode(const CBroadcastRecord& record);
-    static std::optional<CBroadcastRecord> Decode(const std::uint8_t* data, std::size_t size);
+    // The record in shared memory; a record this program sent, or none at all, reads with an
+    // empty molecule name.
+    CBroadcastRecord Read();
 
   signals:
     // Another program announced a record.

@@ -1,10 +1,17 @@
 #include "Settings.h"
 
+#include <QFileInfo>
+
 using namespace SettingsKeys;
 
 CSettings::CSettings()
     : m_settings(QSettings::IniFormat, QSettings::UserScope, QString::fromLatin1(kOrganisation),
                  QString::fromLatin1(kApplication)) {}
+
+QString CSettings::UserSettingsDir() const {
+    const QFileInfo file(m_settings.fileName());
+    return file.absolutePath() + QLatin1Char('/') + file.completeBaseName();
+}
 
 // Sections may hold a "\" between a section and its subsection; QSettings nests groups at "/".
 QString CSettings::Key(const QString& section, const QString& entry) {

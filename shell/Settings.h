@@ -71,6 +71,8 @@ class CSettings {
     void SaveRecentFiles(const QStringList& files);
 
     void Sync() { m_settings.sync(); }
+    // The folder of the user's own files beside the settings ("default.bp1").
+    QString UserSettingsDir() const;
 
   private:
     static QString Key(const QString& section, const QString& entry);

@@ -4,7 +4,9 @@
 #include <QDir>
 #include <QFile>
 #include <QSet>
+#include <QSharedMemory>
 #include <QStandardPaths>
+#include <cstring>
 
 #include "CommandIds.h"
 #include "CommandRouter.h"
@@ -153,29 +155,31 @@ TEST(FileTypes, RegistersTheDesktopEntryAndMimeTypesForTheUser) {
     EXPECT_TRUE(defaults.contains("application/x-qrbo-blockprj=tiler-blocks.desktop"));
 }
 
-TEST(SelectionBroadcast, RecordsRoundTripAndOwnRecordsReadAsEmpty) {
-    CBroadcastRecord record;
-    record.sender = 77;
-    record.molecule = "HBA_HUMAN";
-    record.first = 10;
-    record.last = 42;
-    const std::vector<std::uint8_t> bytes = CSelectionBroadcast::Encode(record);
-    const auto decoded = CSelectionBroadcast::Decode(bytes.data(), bytes.size());
-    ASSERT_TRUE(decoded);
-    EXPECT_EQ(decoded->sender, 77);
-    EXPECT_EQ(decoded->molecule, "HBA_HUMAN");
-    EXPECT_EQ(decoded->kind, 2);
-    EXPECT_EQ(decoded->first, 10);
-    EXPECT_EQ(decoded->last, 42);
-    EXPECT_FALSE(CSelectionBroadcast::Decode(bytes.data(), bytes.size() / 2));
-
+TEST(SelectionBroadcast, OwnRecordsReadAsEmptyAndSiblingRecordsArrive) {
     CSelectionBroadcast broadcast;
+    CBroadcastRecord record;
+    record.moleculeName = "HBA_HUMAN";
+    record.firstPosition = 10;
+    record.lastPosition = 42;
     ASSERT_TRUE(broadcast.Write(record));
-    const auto own = broadcast.Read();
-    ASSERT_TRUE(own);
-    EXPECT_EQ(own->sender, broadcast.OwnSender());
-    EXPECT_TRUE(own->molecule.empty());
-    EXPECT_EQ(own->last, 42);
+    const CBroadcastRecord own = broadcast.Read();
+    EXPECT_EQ(own.sender, broadcast.OwnSender());
+    EXPECT_TRUE(own.moleculeName.empty());
+    EXPECT_EQ(own.lastPosition, 42);
+
+    // A sibling program writes the same region under its own sender id.
+    QSharedMemory sibling(QString::fromLatin1(CSelectionBroadcast::kSharedMemoryName));
+    ASSERT_TRUE(sibling.attach());
+    record.sender = broadcast.OwnSender() + 1;
+    record.moleculeName = "MYG_PHYCA";
+    const std::vector<std::uint8_t> bytes = record.ToBytes();
+    ASSERT_TRUE(sibling.lock());
+    std::memcpy(sibling.data(), bytes.data(), bytes.size());
+    sibling.unlock();
+    const CBroadcastRecord received = broadcast.Read();
+    EXPECT_EQ(received.moleculeName, "MYG_PHYCA");
+    EXPECT_EQ(received.firstPosition, 10);
+    EXPECT_EQ(received.moleculeKind, 2);
 }
 
 TEST(PageSetup, DefaultsConversionAndTheDialog) {
