@@ -1,7 +1,7 @@
 #include "PlaceholderPanes.h"
 
 #include <QHeaderView>
-#include <QLabel>
+#include <QPainter>
 #include <QSet>
 #include <QVBoxLayout>
 
@@ -31,6 +31,13 @@ QColor ColourOf(std::uint32_t value) {
         return {};
     }
     return QColor(value & 0xFF, (value >> 8) & 0xFF, (value >> 16) & 0xFF);
+}
+
+// An empty pane shows its name, faintly, so that the arrangement can be told apart.
+void PaintPaneTitle(QWidget* pane) {
+    QPainter painter(pane);
+    painter.setPen(pane->palette().color(QPalette::Disabled, QPalette::Text));
+    painter.drawText(pane->rect(), Qt::AlignCenter, pane->windowTitle());
 }
 
 }  // namespace
@@ -131,7 +138,7 @@ CBlockListView::CBlockListView(QWidget* parent)
     for (int column = 0; column < 8; ++column) {
         m_table->setColumnWidth(column, widths[column]);
     }
-    m_table->horizontalHeader()->setStretchLastSection(true);
+    m_table->horizontalHeader()->setSectionResizeMode(1, QHeaderView::Stretch);
     m_table->verticalHeader()->setDefaultSectionSize(m_table->fontMetrics().height() + 6);
     FillPane(this, m_table);
 }
@@ -181,4 +188,12 @@ CBlockSchemView::CBlockSchemView(QWidget* parent) : CPaneView(kSchemPane, parent
 CBlockAlnView::CBlockAlnView(QWidget* parent) : CPaneView(kAlnPane, parent) {
     setAutoFillBackground(true);
     setBackgroundRole(QPalette::Base);
+}
+
+void CBlockSchemView::paintEvent(QPaintEvent*) {
+    PaintPaneTitle(this);
+}
+
+void CBlockAlnView::paintEvent(QPaintEvent*) {
+    PaintPaneTitle(this);
 }

@@ -50,10 +50,16 @@ class CBlockSchemView : public CPaneView {
     Q_OBJECT
   public:
     explicit CBlockSchemView(QWidget* parent = nullptr);
+
+  protected:
+    void paintEvent(QPaintEvent* event) override;
 };
 
 class CBlockAlnView : public CPaneView {
     Q_OBJECT
   public:
     explicit CBlockAlnView(QWidget* parent = nullptr);
+
+  protected:
+    void paintEvent(QPaintEvent* event) override;
 };

@@ -4,6 +4,7 @@
 #include <QFileDialog>
 #include <QFileInfo>
 #include <QPrintDialog>
+#include <QScreen>
 #include <QWhatsThis>
 
 #include "AboutDlg.h"
@@ -47,6 +48,10 @@ bool CQuilterApp::InitInstance(const QStringList& arguments, bool registerFileTy
         CFileTypes::Register(QCoreApplication::applicationFilePath());
     }
     m_document->OnNewDocument();
+    // Without a window manager a maximised window keeps its small size: start from the screen's.
+    if (const QScreen* screen = QGuiApplication::primaryScreen()) {
+        m_frame->setGeometry(screen->availableGeometry());
+    }
     m_frame->showMaximized();
 
     const CPageSetup setup = m_settings.LoadPageSetup();

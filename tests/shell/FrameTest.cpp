@@ -11,6 +11,7 @@
 #include <QMimeData>
 #include <QStatusBar>
 #include <QTemporaryDir>
+#include <QTest>
 #include <QToolBar>
 #include <QUrl>
 #include <fstream>
@@ -401,6 +402,22 @@ TEST_F(FrameTest, PanesCycleAndCarryTheirToolbarsAndViewMenus) {
     EXPECT_TRUE(Frame().ToolBar("MainTool Bar")->isVisible());
     EXPECT_TRUE(Frame().ToolBar("TextToolBar")->isVisible());
     EXPECT_FALSE(Frame().ToolBar("SchemeToolBar")->isVisible());
+}
+
+TEST_F(FrameTest, KeysReachThePaneCommands) {
+    Start();
+    Frame().activateWindow();
+    Frame().Pane(kTextPane)->setFocus();
+    Settle();
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_F6);
+    Settle();
+    EXPECT_EQ(Frame().ActivePane(), Frame().Pane(kListPane));
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_F6, Qt::AltModifier);
+    Settle();
+    EXPECT_EQ(Frame().ViewManager().Compose(), QStringLiteral("[1,{(0,2),3}]"));
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_F6, Qt::ShiftModifier);
+    Settle();
+    EXPECT_EQ(Frame().ActivePane(), Frame().Pane(kTextPane));
 }
 
 TEST_F(FrameTest, MaximisesTheActivePaneAndRestoresTheLayout) {
