@@ -60,17 +60,7 @@ bool CQuilterParams::LoadTemplate(const std::string& path, IUserPrompt* prompt) 
         failure = TemplateFileErrorMessage(path);
     } else {
         try {
-            const std::vector<std::uint8_t> bytes = ReadWholeFile(path, kMaxTemplateBytes);
-            if (CArchive::LeadingString(bytes) == kTemplateTag) {
-                CArchive ar = CArchive::ForReading(bytes);
-                std::string tag;
-                ar.XMember(tag);
-                std::unique_ptr<CQuilterParams> read;
-                ar.XPointer(read);
-                if (!read)
-                    throw CArchiveException(CArchiveException::genericError, "no parameters");
-                *this = *read;
-            } else if (prompt) {
+            if (!ReadTemplateBytes(ReadWholeFile(path, kMaxTemplateBytes)) && prompt) {
                 prompt->ShowMessage(NotTemplateMessage(path), MessageIcon::exclamation);
             }
             SetCutoffFromMatrix();
@@ -87,6 +77,20 @@ bool CQuilterParams::LoadTemplate(const std::string& path, IUserPrompt* prompt) 
         SetDefaults();
     }
     return false;
+}
+
+bool CQuilterParams::ReadTemplateBytes(std::span<const std::uint8_t> bytes) {
+    if (CArchive::LeadingString(bytes) != kTemplateTag)
+        return false;
+    CArchive ar = CArchive::ForReading(bytes);
+    std::string tag;
+    ar.XMember(tag);
+    std::unique_ptr<CQuilterParams> read;
+    ar.XPointer(read);
+    if (!read)
+        throw CArchiveException(CArchiveException::genericError, "no parameters");
+    *this = *read;
+    return true;
 }
 
 std::vector<std::uint8_t> CQuilterParams::TemplateBytes() const {

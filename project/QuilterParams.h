@@ -3,6 +3,7 @@
 // colour palette and the score matrix. Stored inside projects and as template files (".bp1").
 
 #include <cstdint>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -55,6 +56,9 @@ class CQuilterParams : public CSerializable {
     // parameters. Whenever the file was read the cutoff becomes the matrix's default cutoff.
     // True when the file was read.
     bool LoadTemplate(const std::string& path, IUserPrompt* prompt);
+    // Takes the parameters of a template file's bytes; false, with nothing changed, when the
+    // bytes are not a template. Throws CArchiveException for a damaged one.
+    bool ReadTemplateBytes(std::span<const std::uint8_t> bytes);
     // Writes a template file, replacing it atomically; a failure is reported through `prompt`.
     bool SaveTemplate(const std::string& path, IUserPrompt& prompt) const;
     // The bytes of a template file holding these parameters.
