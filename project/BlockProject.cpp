@@ -122,7 +122,9 @@ bool CBlockProject::RenameMolecule(const std::string& oldName, const std::string
 
 CSearchJob CBlockProject::PrepareSearch(const std::vector<const CSxMolX*>& selected) const {
     CSearchJob job{m_params.Matrix(), m_params.SearchParameters(), {}, m_blockSet};
-    const int count = static_cast<int>(selected.size());
+    // Never below the lower limit, so that a project file always holds a valid minimum (a
+    // search of fewer molecules fails anyway).
+    const int count = std::max(static_cast<int>(selected.size()), kMinMinSequences);
     if (job.parameters.MinSequences() > count)
         job.parameters.SetMinSequences(count);
     for (const CSxMolX* molecule : selected)

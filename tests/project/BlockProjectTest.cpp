@@ -100,6 +100,15 @@ TEST_F(BlockProjectTest, CompleteSearchInstallsColouredBlocksAndRestartsTheHisto
     EXPECT_EQ(project.BlockMoleculeAt(2), project.MoleculeAt(2));
 }
 
+TEST_F(BlockProjectTest, LoweredMinimumNeverGoesBelowTwo) {
+    const std::vector<const CSxMolX*> one = {project.MoleculeAt(0)};
+    ASSERT_TRUE(project.Search(
+        one, [](CSearchJob&) { return true; }, prompt));
+    EXPECT_EQ(project.Params().MinSequences(), 2);
+    // So the project still saves and opens.
+    EXPECT_TRUE(CBlockProject::FromBytes(project.ToBytes()));
+}
+
 TEST_F(BlockProjectTest, TooManyMoleculesAreRefusedBeforeTheSearchRuns) {
     std::vector<const CSxMolX*> many(65, project.MoleculeAt(0));
     bool ran = false;
