@@ -60,6 +60,25 @@ int CSimBlockSet::AddBlockSorted(std::unique_ptr<CSimBlock> block) {
     return index;
 }
 
+void CSimBlockSet::AddBlocksSorted(std::vector<std::unique_ptr<CSimBlock>> blocks) {
+    auto& existing = m_blocks.items;
+    auto greater = [](const auto& a, const auto& b) { return a->IsGreater(*b); };
+    // In a list in block order each insertion goes after every block that is not smaller, so
+    // adding many at once is a stable sort of the new blocks merged behind their equals.
+    if (!std::is_sorted(existing.begin(), existing.end(), greater)) {
+        for (auto& block : blocks)
+            AddBlockSorted(std::move(block));
+        return;
+    }
+    std::stable_sort(blocks.begin(), blocks.end(), greater);
+    std::vector<std::unique_ptr<CSimBlock>> merged;
+    merged.reserve(existing.size() + blocks.size());
+    std::merge(std::make_move_iterator(existing.begin()), std::make_move_iterator(existing.end()),
+               std::make_move_iterator(blocks.begin()), std::make_move_iterator(blocks.end()),
+               std::back_inserter(merged), greater);
+    existing = std::move(merged);
+}
+
 CSimBlock* CSimBlockSet::BlockAt(int index) {
     return index >= 0 && index < BlockCount() ? m_blocks.items[index].get() : nullptr;
 }

@@ -51,6 +51,9 @@ class CSimBlockSet : public CSerializable {
     // Inserts before the first block that the new one is greater than (CSimBlock::IsGreater),
     // else appends; returns the index. The set takes ownership.
     int AddBlockSorted(std::unique_ptr<CSimBlock> block);
+    // Adds the blocks one after another as AddBlockSorted does, without its quadratic cost when
+    // the set is in block order already (as a search's result set is).
+    void AddBlocksSorted(std::vector<std::unique_ptr<CSimBlock>> blocks);
     // Null when the index is out of range.
     CSimBlock* BlockAt(int index);
     const CSimBlock* BlockAt(int index) const;

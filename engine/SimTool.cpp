@@ -174,18 +174,20 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
         sequences.push_back(&molecule.Codes());
     const int longest = LongestSequenceLength();
     std::vector<CBlockCandidate> candidates;
+    std::vector<std::unique_ptr<CSimBlock>> blocks;
     for (int k = 0; k < total && !cancelled; ++k) {
         ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)", k + 1, total);
         candidates.clear();
         ScanDiagonal(m_diagonals[k], sequences, longest, grid, m_cutoff, EffectiveMinSequences(),
                      candidates);
         for (const CBlockCandidate& candidate : candidates) {
-            auto block = std::make_unique<CSimBlock>();
-            block->Init(candidate.molecules, candidate.starts, candidate.width, candidate.score, 0);
-            m_result->AddBlockSorted(std::move(block));
+            blocks.push_back(std::make_unique<CSimBlock>());
+            blocks.back()->Init(candidate.molecules, candidate.starts, candidate.width,
+                                candidate.score, 0);
         }
         cancelled = StepProgress();
     }
+    m_result->AddBlocksSorted(std::move(blocks));
     return true;
 }
 
