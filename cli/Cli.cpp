@@ -11,6 +11,7 @@ int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream
     AddMatrixCommands(app, context);
     AddMoleculeCommands(app, context);
     AddProjectCommands(app, context);
+    AddSearchCommand(app, context);
 
     std::vector<std::string> reversed(args.rbegin(), args.rend());
     try {

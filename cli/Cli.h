@@ -35,6 +35,7 @@ struct CCliContext {
 void AddMatrixCommands(CLI::App& app, CCliContext& context);
 void AddMoleculeCommands(CLI::App& app, CCliContext& context);
 void AddProjectCommands(CLI::App& app, CCliContext& context);
+void AddSearchCommand(CLI::App& app, CCliContext& context);
 
 // Parses `args` (without the program name) and runs the command; returns the exit status.
 int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream& err,

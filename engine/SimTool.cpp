@@ -173,13 +173,13 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
     for (const CSimMol& molecule : m_molecules)
         sequences.push_back(&molecule.Codes());
     const int longest = LongestSequenceLength();
+    CJoinedRunCache joins(sequences, grid, m_cutoff);
     std::vector<CBlockCandidate> candidates;
     std::vector<std::unique_ptr<CSimBlock>> blocks;
     for (int k = 0; k < total && !cancelled; ++k) {
         ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)", k + 1, total);
         candidates.clear();
-        ScanDiagonal(m_diagonals[k], sequences, longest, grid, m_cutoff, EffectiveMinSequences(),
-                     candidates);
+        ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins, candidates);
         for (const CBlockCandidate& candidate : candidates) {
             blocks.push_back(std::make_unique<CSimBlock>());
             blocks.back()->Init(candidate.molecules, candidate.starts, candidate.width,

@@ -51,6 +51,10 @@ bool CDiagonalExpander::Expand(const CSimHit& hit, const std::function<bool()>& 
     m_shouldAbort = &shouldAbort;
     m_found.clear();
     CollectPlacements(hit);
+    if (m_candidateCount + 2 < m_minSequences || SomeExcludedJoinsEveryCandidate()) {
+        // No diagonal of this hit can be kept; the search would only find that out slowly.
+        return !shouldAbort();
+    }
     BuildAdjacency();
 
     CVertexSet candidates(m_words, 0);
@@ -87,18 +91,27 @@ void CDiagonalExpander::CollectPlacements(const CSimHit& hit) {
     m_placements.insert(m_placements.end(), excluded.begin(), excluded.end());
 }
 
+bool CDiagonalExpander::Joins(const CPlacement& a, const CPlacement& b) const {
+    return a.molecule != b.molecule &&
+           m_masks.Has(a.molecule, b.molecule, static_cast<long>(b.offset) - a.offset);
+}
+
+bool CDiagonalExpander::SomeExcludedJoinsEveryCandidate() const {
+    const auto candidates = m_placements.begin() + m_candidateCount;
+    return std::any_of(candidates, m_placements.end(), [&](const CPlacement& excluded) {
+        return std::all_of(m_placements.begin(), candidates,
+                           [&](const CPlacement& candidate) { return Joins(excluded, candidate); });
+    });
+}
+
 void CDiagonalExpander::BuildAdjacency() {
     const std::size_t count = m_placements.size();
     m_words = (count + 63) / 64;
     m_adjacency.assign(count * m_words, 0);
     for (std::size_t u = 0; u < count; ++u) {
         for (std::size_t v = u + 1; v < count; ++v) {
-            const CPlacement& a = m_placements[u];
-            const CPlacement& b = m_placements[v];
-            if (a.molecule == b.molecule ||
-                !m_masks.Has(a.molecule, b.molecule, static_cast<long>(b.offset) - a.offset)) {
+            if (!Joins(m_placements[u], m_placements[v]))
                 continue;
-            }
             m_adjacency[u * m_words + v / 64] |= std::uint64_t{1} << (v % 64);
             m_adjacency[v * m_words + u / 64] |= std::uint64_t{1} << (u % 64);
         }

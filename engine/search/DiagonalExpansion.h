@@ -38,6 +38,10 @@ class CDiagonalExpander {
     using CVertexSet = std::vector<std::uint64_t>;
 
     void CollectPlacements(const CSimHit& hit);
+    bool Joins(const CPlacement& a, const CPlacement& b) const;
+    // An excluded placement that agrees with every candidate makes every diagonal of the hit
+    // extendable, so none is maximal.
+    bool SomeExcludedJoinsEveryCandidate() const;
     void BuildAdjacency();
     bool Search(std::vector<int>& clique, CVertexSet candidates, CVertexSet excluded);
     int ChoosePivot(const CVertexSet& candidates, const CVertexSet& excluded) const;

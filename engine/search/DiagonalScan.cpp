@@ -63,29 +63,22 @@ std::uint64_t GroupOf(int root, const std::uint64_t* joins, std::uint64_t& visit
 
 class CDiagonalScanner {
   public:
-    CDiagonalScanner(const CSimDiag& diagonal,
-                     const std::vector<const std::vector<std::uint8_t>*>& sequences, int longest,
-                     const CScoreGrid& grid)
-        : m_diagonal(diagonal), m_sequences(sequences), m_grid(grid) {
+    CDiagonalScanner(const CSimDiag& diagonal, int longest, CJoinedRunCache& joins)
+        : m_diagonal(diagonal), m_joins(joins) {
         for (int t = 0; t < diagonal.MemberCount(); ++t) {
             m_firstColumn.push_back(longest - diagonal.offsets[t]);
         }
     }
 
-    void CollectJoins(int cutoff) {
+    void CollectJoins() {
         const int count = m_diagonal.MemberCount();
-        std::vector<CJoinedRun> runs;
         for (int a = 0; a < count; ++a) {
             for (int b = a + 1; b < count; ++b) {
-                const int low = std::max(m_firstColumn[a], m_firstColumn[b]);
-                const int high = std::min(EndColumn(a), EndColumn(b));
-                if (high <= low)
-                    continue;
-                FindJoinedRuns(Residues(a, low), Residues(b, low), high - low, m_grid, cutoff,
-                               runs);
-                for (const CJoinedRun& run : runs) {
-                    m_events.push_back({low + run.begin, true, a, b});
-                    m_events.push_back({low + run.end, false, a, b});
+                const int offset = m_diagonal.offsets[b] - m_diagonal.offsets[a];
+                for (const CJoinedRun& run :
+                     m_joins.Runs(m_diagonal.members[a], m_diagonal.members[b], offset)) {
+                    m_events.push_back({m_firstColumn[a] + run.begin, true, a, b});
+                    m_events.push_back({m_firstColumn[a] + run.end, false, a, b});
                 }
             }
         }
@@ -125,11 +118,8 @@ class CDiagonalScanner {
     }
 
   private:
-    int EndColumn(int t) const {
-        return m_firstColumn[t] + static_cast<int>(m_sequences[m_diagonal.members[t]]->size());
-    }
     const std::uint8_t* Residues(int t, int column) const {
-        return m_sequences[m_diagonal.members[t]]->data() + (column - m_firstColumn[t]);
+        return m_joins.Residues(m_diagonal.members[t]) + (column - m_firstColumn[t]);
     }
 
     CBlockCandidate MakeBlock(std::uint64_t group, int firstColumn, int endColumn) const {
@@ -142,11 +132,12 @@ class CDiagonalScanner {
             block.starts.push_back(firstColumn - m_firstColumn[t]);
             rows.push_back(Residues(t, firstColumn));
         }
+        const CScoreGrid& grid = m_joins.Grid();
         long long score = 0;
         for (std::size_t u = 0; u < rows.size(); ++u) {
             for (std::size_t v = u + 1; v < rows.size(); ++v) {
                 for (int c = 0; c < block.width; ++c)
-                    score += m_grid(rows[u][c], rows[v][c]);
+                    score += grid(rows[u][c], rows[v][c]);
             }
         }
         block.score = static_cast<int>(score);
@@ -154,19 +145,37 @@ class CDiagonalScanner {
     }
 
     const CSimDiag& m_diagonal;
-    const std::vector<const std::vector<std::uint8_t>*>& m_sequences;
-    const CScoreGrid& m_grid;
+    CJoinedRunCache& m_joins;
     std::vector<int> m_firstColumn;
     std::vector<CJoinEvent> m_events;
 };
 
 }  // namespace
 
-void ScanDiagonal(const CSimDiag& diagonal,
-                  const std::vector<const std::vector<std::uint8_t>*>& sequences, int longest,
-                  const CScoreGrid& grid, int cutoff, int minSequences,
+const std::vector<CJoinedRun>& CJoinedRunCache::Runs(int a, int b, int offset) {
+    const std::uint64_t key = (static_cast<std::uint64_t>(a) << 40) |
+                              (static_cast<std::uint64_t>(b) << 34) |
+                              static_cast<std::uint32_t>(offset);
+    auto [entry, added] = m_runs.try_emplace(key);
+    if (added) {
+        // Positions of a whose partner in b exists.
+        const int first = std::max(0, -offset);
+        const int end = std::min(Length(a), Length(b) - offset);
+        if (end > first) {
+            FindJoinedRuns(Residues(a) + first, Residues(b) + first + offset, end - first, m_grid,
+                           m_cutoff, entry->second);
+            for (CJoinedRun& run : entry->second) {
+                run.begin += first;
+                run.end += first;
+            }
+        }
+    }
+    return entry->second;
+}
+
+void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CJoinedRunCache& joins,
                   std::vector<CBlockCandidate>& blocks) {
-    CDiagonalScanner scanner(diagonal, sequences, longest, grid);
-    scanner.CollectJoins(cutoff);
+    CDiagonalScanner scanner(diagonal, longest, joins);
+    scanner.CollectJoins();
     scanner.Sweep(minSequences, blocks);
 }

@@ -8,6 +8,7 @@
 // only change where a joined run starts or ends, so only those columns are examined.
 
 #include <cstdint>
+#include <unordered_map>
 #include <vector>
 
 #include "SimDiag.h"
@@ -32,8 +33,29 @@ struct CJoinedRun {
 void FindJoinedRuns(const std::uint8_t* a, const std::uint8_t* b, int length,
                     const CScoreGrid& grid, int cutoff, std::vector<CJoinedRun>& runs);
 
-// Appends the blocks of `diagonal` in the order they are made. `minSequences` is at least 2.
-void ScanDiagonal(const CSimDiag& diagonal,
-                  const std::vector<const std::vector<std::uint8_t>*>& sequences, int longest,
-                  const CScoreGrid& grid, int cutoff, int minSequences,
+// The joined runs of two molecules in one relative placement depend on nothing else, and the
+// diagonals of a search share most of their placements: each is found once per search.
+class CJoinedRunCache {
+  public:
+    CJoinedRunCache(const std::vector<const std::vector<std::uint8_t>*>& sequences,
+                    const CScoreGrid& grid, int cutoff)
+        : m_sequences(sequences), m_grid(grid), m_cutoff(cutoff) {}
+
+    // The runs of molecules a and b, with residue p of a facing residue p + offset of b, in
+    // positions of a.
+    const std::vector<CJoinedRun>& Runs(int a, int b, int offset);
+    int Length(int molecule) const { return static_cast<int>(m_sequences[molecule]->size()); }
+    const std::uint8_t* Residues(int molecule) const { return m_sequences[molecule]->data(); }
+    const CScoreGrid& Grid() const { return m_grid; }
+
+  private:
+    const std::vector<const std::vector<std::uint8_t>*>& m_sequences;
+    const CScoreGrid& m_grid;
+    int m_cutoff;
+    std::unordered_map<std::uint64_t, std::vector<CJoinedRun>> m_runs;
+};
+
+// Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the
+// longest molecule of the search; `minSequences` is at least 2.
+void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CJoinedRunCache& joins,
                   std::vector<CBlockCandidate>& blocks);

@@ -1,5 +1,10 @@
 // Compiled once per instruction set that Highway targets; the best one is chosen at run time.
 #if TB_HAVE_HWY
+// Only AVX2 and the baseline are chosen at run time (see ChooseKernel), so only they are built.
+#ifndef HWY_DISABLED_TARGETS
+#define HWY_DISABLED_TARGETS \
+    ((1LL << 7) | (1LL << 8) | (1LL << 11) | (1LL << 12))  // AVX-512, SSE4, SSSE3
+#endif
 #undef HWY_TARGET_INCLUDE
 #define HWY_TARGET_INCLUDE "search/PairScanKernel.cpp"
 #include <hwy/foreach_target.h>  // IWYU pragma: keep
@@ -53,15 +58,31 @@ void ScanProfileRowsImpl(const std::int16_t* profile, std::size_t stride, const 
 HWY_AFTER_NAMESPACE();
 
 #if HWY_ONCE
-namespace tb_search {
-HWY_EXPORT(ScanProfileRowsImpl);
-}  // namespace tb_search
+namespace {
+
+using CKernel = decltype(&tb_search::HWY_STATIC_DISPATCH(ScanProfileRowsImpl));
+
+// The widest instruction set this processor runs. Chosen here rather than through Highway's
+// run-time dispatch, which would load its shared library (and its start-up cost) with every
+// program of the project.
+CKernel ChooseKernel() {
+#if (HWY_TARGETS & HWY_AVX2) && HWY_ARCH_X86
+    __builtin_cpu_init();
+    if (__builtin_cpu_supports("avx2") && __builtin_cpu_supports("bmi2") &&
+        __builtin_cpu_supports("fma")) {
+        return &tb_search::N_AVX2::ScanProfileRowsImpl;
+    }
+#endif
+    return &tb_search::HWY_STATIC_DISPATCH(ScanProfileRowsImpl);
+}
+
+}  // namespace
 
 void ScanProfileRows(const std::int16_t* profile, std::size_t stride, const std::uint8_t* rows,
                      std::size_t rowCount, std::size_t colCount, std::int16_t cutoff,
                      std::int16_t* state, std::uint8_t* hitByDiagonal) {
-    HWY_DYNAMIC_DISPATCH(tb_search::ScanProfileRowsImpl)
-    (profile, stride, rows, rowCount, colCount, cutoff, state, hitByDiagonal);
+    static const CKernel kernel = ChooseKernel();
+    kernel(profile, stride, rows, rowCount, colCount, cutoff, state, hitByDiagonal);
 }
 #endif
 #endif  // TB_HAVE_HWY

@@ -142,9 +142,11 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     CSimDiag diagonal;
     diagonal.members = {0, 1, 2};
     diagonal.offsets = {0, 0, 0};
+    const CScoreGrid grid = ColumnExampleGrid();
     for (int minimum : {2, 3}) {
+        CJoinedRunCache joins(sequences, grid, 4);
         std::vector<CBlockCandidate> blocks;
-        ScanDiagonal(diagonal, sequences, 30, ColumnExampleGrid(), 4, minimum, blocks);
+        ScanDiagonal(diagonal, 30, minimum, joins, blocks);
         ASSERT_EQ(blocks.size(), 1u) << minimum;
         EXPECT_EQ(blocks[0].molecules, (std::vector<std::int32_t>{0, 1, 2}));
         EXPECT_EQ(blocks[0].starts, (std::vector<std::int32_t>{11, 11, 11}));
@@ -155,10 +157,11 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     // Without the third member only the pair is joined: a block of two, or none with S = 3.
     const auto unrelated = Codes(std::string(30, 'X'));
     const std::vector<const std::vector<std::uint8_t>*> pairOnly{&first, &second, &unrelated};
+    CJoinedRunCache joins(pairOnly, grid, 4);
     std::vector<CBlockCandidate> blocks;
-    ScanDiagonal(diagonal, pairOnly, 30, ColumnExampleGrid(), 4, 3, blocks);
+    ScanDiagonal(diagonal, 30, 3, joins, blocks);
     EXPECT_TRUE(blocks.empty());
-    ScanDiagonal(diagonal, pairOnly, 30, ColumnExampleGrid(), 4, 2, blocks);
+    ScanDiagonal(diagonal, 30, 2, joins, blocks);
     ASSERT_EQ(blocks.size(), 1u);
     EXPECT_EQ(blocks[0].molecules, (std::vector<std::int32_t>{0, 1}));
     EXPECT_EQ(blocks[0].starts, (std::vector<std::int32_t>{10, 10}));
