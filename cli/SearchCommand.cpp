@@ -177,8 +177,9 @@ std::string FailureText(const CSearchOutcome& outcome, const CBlockProject& proj
             return "molecule \"" + outcome.failedMolecule +
                    "\" holds a residue outside the alphabet of matrix \"" +
                    project.Params().Matrix().Name() + "\"";
+        case CSimTool::kLowMemory:
         case CSimTool::kOutOfMemory:
-            return "out of memory";
+            return "not enough memory for its diagonals and blocks";
         default:
             return "the search did not complete";
     }

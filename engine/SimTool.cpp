@@ -15,6 +15,17 @@
 #include "search/OrderedWork.h"
 #include "search/PairScan.h"
 
+namespace {
+
+// The approximate memory of a block of `members` members: the block and its four arrays.
+std::size_t BlockBytes(std::size_t members) {
+    constexpr std::size_t kAllocationOverhead = 16;
+    return sizeof(CSimBlock) + sizeof(std::unique_ptr<CSimBlock>) + 4 * kAllocationOverhead +
+           members * 4 * sizeof(std::int32_t);
+}
+
+}  // namespace
+
 const char* const CSimTool::kLowMemoryMessage =
     "Your system is getting low of virtual memory.\nUnable to proceed with block searching.";
 
@@ -59,6 +70,7 @@ int CSimTool::Run() {
     m_hits.clear();
     m_diagonals.clear();
     m_pairOffsets.clear();
+    m_heldBytes = 0;
     SetStatusText("Initializing...");
     m_result->ClearBlocks();
     if (m_molecules.size() < 2)
@@ -150,20 +162,27 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
     const std::function<bool()> shouldAbort = [&] {
         if (IsCancelled())
             return true;
-        lowMemory = IsMemoryLow();
+        lowMemory = m_heldBytes + expander.FoundBytes() > m_memoryBudget || IsMemoryLow();
         return lowMemory;
     };
     for (int k = 0; k < total && !cancelled; ++k) {
         ReportProgress("Expanding diagonals (hit %d of %d)", k + 1, total);
         if (!expander.Expand(m_hits[k], shouldAbort, m_diagonals)) {
             if (lowMemory)
-                ShowMessage(kLowMemoryMessage);
-            m_failure = lowMemory ? kLowMemory : kCancelled;
+                return StopLowOnMemory();
+            m_failure = kCancelled;
             return false;
         }
+        m_heldBytes += expander.FoundBytes();
         cancelled = StepProgress();
     }
     return true;
+}
+
+bool CSimTool::StopLowOnMemory() {
+    ShowMessage(kLowMemoryMessage);
+    m_failure = kLowMemory;
+    return false;
 }
 
 bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
@@ -184,7 +203,10 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
             blocks.push_back(std::make_unique<CSimBlock>());
             blocks.back()->Init(candidate.molecules, candidate.starts, candidate.width,
                                 candidate.score, 0);
+            m_heldBytes += BlockBytes(candidate.molecules.size());
         }
+        if (m_heldBytes > m_memoryBudget || IsMemoryLow())
+            return StopLowOnMemory();
         cancelled = StepProgress();
     }
     m_result->AddBlocksSorted(std::move(blocks));

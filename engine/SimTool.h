@@ -28,6 +28,10 @@ class CSimTool {
     // The masks that relate molecules hold one bit per molecule.
     static constexpr int kMaxMolecules = 64;
     static const char* const kLowMemoryMessage;
+    // How much the diagonals and blocks of one search may hold before it stops as low on memory.
+    // Families with self-similar stretches have exponentially many diagonals; the budget stops
+    // them early instead of when the whole system runs out.
+    static constexpr std::size_t kDefaultMemoryBudget = std::size_t{128} << 20;
 
     // Why a run did not complete.
     enum Failure {
@@ -57,6 +61,7 @@ class CSimTool {
 
     // Worker threads of phase one; 0 (the default) uses every core.
     void SetThreadCount(int count) { m_threadCount = count; }
+    void SetMemoryBudget(std::size_t bytes) { m_memoryBudget = bytes; }
     // Asks a running search to stop after its current item; safe from any thread.
     void RequestCancel() { m_cancelRequested.store(true, std::memory_order_relaxed); }
 
@@ -97,6 +102,8 @@ class CSimTool {
     bool ExpandDiagonals(const CHitMasks& masks, bool& cancelled);
     bool ScanDiagonals(const CScoreGrid& grid, bool& cancelled);
     int Fail(Failure failure);
+    // Stops the run as low on memory: shows the message and records the failure.
+    bool StopLowOnMemory();
     int EffectiveMinSequences() const;
 
     std::unique_ptr<CScoreMatrix> m_matrix;
@@ -109,6 +116,8 @@ class CSimTool {
     Failure m_failure = kNoFailure;
     int m_failedMolecule = -1;
     std::unique_ptr<CMemoryWatch> m_memoryWatch;
+    std::size_t m_memoryBudget = kDefaultMemoryBudget;
+    std::size_t m_heldBytes = 0;  // held by the kept diagonals and the blocks made so far
     std::vector<CSimHit> m_hits;
     std::vector<CSimDiag> m_diagonals;
     // Hit offsets per pair a < b, ascending: pairOffsets[a][b].

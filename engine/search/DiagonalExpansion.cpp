@@ -50,6 +50,7 @@ bool CDiagonalExpander::Expand(const CSimHit& hit, const std::function<bool()>& 
     m_hit = hit;
     m_shouldAbort = &shouldAbort;
     m_found.clear();
+    m_foundBytes = 0;
     CollectPlacements(hit);
     if (m_candidateCount + 2 < m_minSequences || SomeExcludedJoinsEveryCandidate()) {
         // No diagonal of this hit can be kept; the search would only find that out slowly.
@@ -89,6 +90,12 @@ void CDiagonalExpander::CollectPlacements(const CSimHit& hit) {
     }
     m_candidateCount = static_cast<int>(m_placements.size());
     m_placements.insert(m_placements.end(), excluded.begin(), excluded.end());
+}
+
+std::size_t CDiagonalExpander::BytesOf(const CSimDiag& diagonal) {
+    constexpr std::size_t kAllocationOverhead = 16;
+    return sizeof(CSimDiag) + 2 * kAllocationOverhead +
+           diagonal.members.size() * (sizeof(std::uint16_t) + sizeof(std::int32_t));
 }
 
 bool CDiagonalExpander::Joins(const CPlacement& a, const CPlacement& b) const {
@@ -186,5 +193,6 @@ void CDiagonalExpander::Report(const std::vector<int>& clique) {
     CSimDiag diagonal(m_hit);
     for (const CPlacement& placement : others)
         diagonal.Append(placement.molecule, placement.offset);
+    m_foundBytes += BytesOf(diagonal);
     m_found.push_back(std::move(diagonal));
 }

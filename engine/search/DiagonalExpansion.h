@@ -29,6 +29,9 @@ class CDiagonalExpander {
     // search; when it answers true nothing more is appended and the result is false.
     bool Expand(const CSimHit& hit, const std::function<bool()>& shouldAbort,
                 std::vector<CSimDiag>& kept);
+    // The approximate memory of the diagonals found so far for the current hit.
+    std::size_t FoundBytes() const { return m_foundBytes; }
+    static std::size_t BytesOf(const CSimDiag& diagonal);
 
   private:
     struct CPlacement {
@@ -59,4 +62,5 @@ class CDiagonalExpander {
     std::size_t m_words = 0;
     std::vector<std::uint64_t> m_adjacency;  // m_words per placement
     std::vector<CSimDiag> m_found;
+    std::size_t m_foundBytes = 0;
 };

@@ -58,7 +58,23 @@ std::uint64_t GroupOf(int root, const std::uint64_t* joins, std::uint64_t& visit
         group |= next;
         frontier |= next;
     }
-    return std::popcount(group) >= 2 ? group : 0;
+    return (group & (group - 1)) != 0 ? group : 0;
+}
+
+// Whether a and b are connected through joins.
+bool Connected(int a, int b, const std::uint64_t* joins) {
+    std::uint64_t reached = std::uint64_t{1} << a;
+    std::uint64_t frontier = reached;
+    while (frontier != 0) {
+        const int node = std::countr_zero(frontier);
+        frontier &= frontier - 1;
+        const std::uint64_t next = joins[node] & ~reached;
+        if ((next >> b) & 1)
+            return true;
+        reached |= next;
+        frontier |= next;
+    }
+    return false;
 }
 
 class CDiagonalScanner {
@@ -68,6 +84,7 @@ class CDiagonalScanner {
         for (int t = 0; t < diagonal.MemberCount(); ++t) {
             m_firstColumn.push_back(longest - diagonal.offsets[t]);
         }
+        m_pairJoins.resize(diagonal.MemberCount() * diagonal.MemberCount());
     }
 
     void CollectJoins() {
@@ -75,25 +92,29 @@ class CDiagonalScanner {
         for (int a = 0; a < count; ++a) {
             for (int b = a + 1; b < count; ++b) {
                 const int offset = m_diagonal.offsets[b] - m_diagonal.offsets[a];
-                for (const CJoinedRun& run :
-                     m_joins.Runs(m_diagonal.members[a], m_diagonal.members[b], offset)) {
+                const CPairJoin& join =
+                    m_joins.Join(m_diagonal.members[a], m_diagonal.members[b], offset);
+                m_pairJoins[a * count + b] = &join;
+                for (const CJoinedRun& run : join.runs) {
                     m_events.push_back({m_firstColumn[a] + run.begin, true, a, b});
                     m_events.push_back({m_firstColumn[a] + run.end, false, a, b});
                 }
             }
         }
-        std::sort(m_events.begin(), m_events.end(), [](const CJoinEvent& x, const CJoinEvent& y) {
-            return x.column != y.column ? x.column < y.column : x.starts < y.starts;
-        });
+        SortEventsByColumn();
     }
 
     void Sweep(int minSequences, std::vector<CBlockCandidate>& blocks) {
         const int count = m_diagonal.MemberCount();
         std::uint64_t joins[64] = {};
+        std::uint64_t component[64];  // per member, the members it is connected to (itself too)
+        for (int t = 0; t < count; ++t)
+            component[t] = std::uint64_t{1} << t;
         std::uint64_t previous[64] = {};
         int runStart[64] = {};
         for (std::size_t e = 0; e < m_events.size();) {
             const int column = m_events[e].column;
+            const std::size_t first = e;
             for (; e < m_events.size() && m_events[e].column == column; ++e) {
                 const CJoinEvent& event = m_events[e];
                 const std::uint64_t bitA = std::uint64_t{1} << event.a;
@@ -101,6 +122,8 @@ class CDiagonalScanner {
                 joins[event.a] = event.starts ? joins[event.a] | bitB : joins[event.a] & ~bitB;
                 joins[event.b] = event.starts ? joins[event.b] | bitA : joins[event.b] & ~bitA;
             }
+            if (!GroupsChanged(first, e, joins, component))
+                continue;
             std::uint64_t visited = 0;
             for (int root = 0; root + 1 < count; ++root) {
                 const std::uint64_t group = GroupOf(root, joins, visited);
@@ -114,30 +137,78 @@ class CDiagonalScanner {
                     runStart[root] = column;
                 previous[root] = group;
             }
+            UpdateComponents(count, joins, component);
         }
     }
 
   private:
-    const std::uint8_t* Residues(int t, int column) const {
-        return m_joins.Residues(m_diagonal.members[t]) + (column - m_firstColumn[t]);
+    // Orders the events by column (a counting sort: columns are below 3L).
+    void SortEventsByColumn() {
+        int columns = 0;
+        for (const CJoinEvent& event : m_events)
+            columns = std::max(columns, event.column + 1);
+        std::vector<int> firstOfColumn(columns + 1, 0);
+        for (const CJoinEvent& event : m_events)
+            ++firstOfColumn[event.column + 1];
+        for (int c = 0; c < columns; ++c)
+            firstOfColumn[c + 1] += firstOfColumn[c];
+        std::vector<CJoinEvent> sorted(m_events.size());
+        for (const CJoinEvent& event : m_events)
+            sorted[firstOfColumn[event.column]++] = event;
+        m_events = std::move(sorted);
+    }
+
+    // Whether the joins changed by events [first, end) split or merge any connected set: a new
+    // join between two sets, or an ended join whose members are no longer connected.
+    bool GroupsChanged(std::size_t first, std::size_t end, const std::uint64_t* joins,
+                       const std::uint64_t* component) const {
+        for (std::size_t e = first; e < end; ++e) {
+            const CJoinEvent& event = m_events[e];
+            const bool changed = event.starts ? !((component[event.a] >> event.b) & 1)
+                                              : !Connected(event.a, event.b, joins);
+            if (changed)
+                return true;
+        }
+        return false;
+    }
+
+    static void UpdateComponents(int count, const std::uint64_t* joins, std::uint64_t* component) {
+        std::uint64_t done = 0;
+        for (int t = 0; t < count; ++t) {
+            if ((done >> t) & 1)
+                continue;
+            std::uint64_t reached = std::uint64_t{1} << t;
+            std::uint64_t frontier = reached;
+            while (frontier != 0) {
+                const int node = std::countr_zero(frontier);
+                frontier &= frontier - 1;
+                const std::uint64_t next = joins[node] & ~reached;
+                reached |= next;
+                frontier |= next;
+            }
+            for (std::uint64_t rest = reached; rest != 0; rest &= rest - 1)
+                component[std::countr_zero(rest)] = reached;
+            done |= reached;
+        }
     }
 
     CBlockCandidate MakeBlock(std::uint64_t group, int firstColumn, int endColumn) const {
         CBlockCandidate block;
         block.width = endColumn - firstColumn;
-        std::vector<const std::uint8_t*> rows;
+        std::vector<int> members;
         for (std::uint64_t rest = group; rest != 0; rest &= rest - 1) {
             const int t = std::countr_zero(rest);
+            members.push_back(t);
             block.molecules.push_back(m_diagonal.members[t]);
             block.starts.push_back(firstColumn - m_firstColumn[t]);
-            rows.push_back(Residues(t, firstColumn));
         }
-        const CScoreGrid& grid = m_joins.Grid();
-        long long score = 0;
-        for (std::size_t u = 0; u < rows.size(); ++u) {
-            for (std::size_t v = u + 1; v < rows.size(); ++v) {
-                for (int c = 0; c < block.width; ++c)
-                    score += grid(rows[u][c], rows[v][c]);
+        const int count = m_diagonal.MemberCount();
+        std::int64_t score = 0;
+        for (std::size_t u = 0; u < members.size(); ++u) {
+            const int start = block.starts[u];
+            for (std::size_t v = u + 1; v < members.size(); ++v) {
+                score +=
+                    m_pairJoins[members[u] * count + members[v]]->Sum(start, start + block.width);
             }
         }
         block.score = static_cast<int>(score);
@@ -146,31 +217,38 @@ class CDiagonalScanner {
 
     const CSimDiag& m_diagonal;
     CJoinedRunCache& m_joins;
+    std::vector<const CPairJoin*> m_pairJoins;  // per member pair a < b: index a * count + b
     std::vector<int> m_firstColumn;
     std::vector<CJoinEvent> m_events;
 };
 
 }  // namespace
 
-const std::vector<CJoinedRun>& CJoinedRunCache::Runs(int a, int b, int offset) {
+const CPairJoin& CJoinedRunCache::Join(int a, int b, int offset) {
     const std::uint64_t key = (static_cast<std::uint64_t>(a) << 40) |
                               (static_cast<std::uint64_t>(b) << 34) |
                               static_cast<std::uint32_t>(offset);
-    auto [entry, added] = m_runs.try_emplace(key);
-    if (added) {
-        // Positions of a whose partner in b exists.
-        const int first = std::max(0, -offset);
-        const int end = std::min(Length(a), Length(b) - offset);
-        if (end > first) {
-            FindJoinedRuns(Residues(a) + first, Residues(b) + first + offset, end - first, m_grid,
-                           m_cutoff, entry->second);
-            for (CJoinedRun& run : entry->second) {
-                run.begin += first;
-                run.end += first;
-            }
+    auto [entry, added] = m_joins.try_emplace(key);
+    CPairJoin& join = entry->second;
+    if (!added)
+        return join;
+    // Positions of a whose partner in b exists.
+    join.first = std::max(0, -offset);
+    const int end = std::max(join.first, std::min(Length(a), Length(b) - offset));
+    const std::uint8_t* residuesA = Residues(a) + join.first;
+    const std::uint8_t* residuesB = Residues(b) + join.first + offset;
+    join.prefix.assign(end - join.first + 1, 0);
+    for (int k = 0; k < end - join.first; ++k) {
+        join.prefix[k + 1] = join.prefix[k] + m_grid(residuesA[k], residuesB[k]);
+    }
+    if (end > join.first) {
+        FindJoinedRuns(residuesA, residuesB, end - join.first, m_grid, m_cutoff, join.runs);
+        for (CJoinedRun& run : join.runs) {
+            run.begin += join.first;
+            run.end += join.first;
         }
     }
-    return entry->second;
+    return join;
 }
 
 void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CJoinedRunCache& joins,

@@ -33,26 +33,37 @@ struct CJoinedRun {
 void FindJoinedRuns(const std::uint8_t* a, const std::uint8_t* b, int length,
                     const CScoreGrid& grid, int cutoff, std::vector<CJoinedRun>& runs);
 
-// The joined runs of two molecules in one relative placement depend on nothing else, and the
-// diagonals of a search share most of their placements: each is found once per search.
+// Two molecules in one relative placement: residue p of the first faces residue p + offset of
+// the second over positions [first, end) of the first.
+struct CPairJoin {
+    int first = 0;
+    std::vector<CJoinedRun> runs;      // in positions of the first molecule
+    std::vector<std::int64_t> prefix;  // prefix[k]: the scores of positions first..first+k-1
+    // The summed scores of positions [begin, end) of the first molecule.
+    std::int64_t Sum(int begin, int end) const {
+        return prefix[end - first] - prefix[begin - first];
+    }
+};
+
+// What two molecules in one relative placement give depends on nothing else, and the diagonals
+// of a search share most of their placements: each is worked out once per search.
 class CJoinedRunCache {
   public:
     CJoinedRunCache(const std::vector<const std::vector<std::uint8_t>*>& sequences,
                     const CScoreGrid& grid, int cutoff)
         : m_sequences(sequences), m_grid(grid), m_cutoff(cutoff) {}
 
-    // The runs of molecules a and b, with residue p of a facing residue p + offset of b, in
-    // positions of a.
-    const std::vector<CJoinedRun>& Runs(int a, int b, int offset);
+    // Molecules a and b with residue p of a facing residue p + offset of b. The reference stays
+    // valid as long as the cache.
+    const CPairJoin& Join(int a, int b, int offset);
     int Length(int molecule) const { return static_cast<int>(m_sequences[molecule]->size()); }
     const std::uint8_t* Residues(int molecule) const { return m_sequences[molecule]->data(); }
-    const CScoreGrid& Grid() const { return m_grid; }
 
   private:
     const std::vector<const std::vector<std::uint8_t>*>& m_sequences;
     const CScoreGrid& m_grid;
     int m_cutoff;
-    std::unordered_map<std::uint64_t, std::vector<CJoinedRun>> m_runs;
+    std::unordered_map<std::uint64_t, CPairJoin> m_joins;
 };
 
 // Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the

@@ -49,6 +49,7 @@ void ExpectSameSearch(const CSearchInput& input, int threads, CTally& tally) {
     CSimTool tool(literal::MatrixOf(input), CSimBlockParameters(input.cutoff, input.minSequences),
                   molecules, &result);
     tool.SetThreadCount(threads);
+    tool.SetMemoryBudget(SIZE_MAX);  // results here may be large; the budget is not under test
     ASSERT_EQ(tool.Run(), 1) << literal::Describe(input);
     if (tool.Diagonals().size() > kLiteralDiagonalLimit) {
         ++tally.skipped;
