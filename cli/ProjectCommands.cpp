@@ -7,7 +7,7 @@
 #include <ostream>
 
 #include "BlockProject.h"
-#include "BlockSignificance.h"
+#include "BlockTable.h"
 #include "Cli.h"
 #include "archive/FileIO.h"
 
@@ -52,40 +52,10 @@ void SaveProject(const CBlockProject& project, const std::string& path) {
     }
 }
 
-const char* SignificanceWord(int state) {
-    switch (state) {
-        case kSignificant:
-            return "yes";
-        case kNotSignificant:
-            return "no";
-        default:
-            return "n/a";
-    }
-}
-
 // One row of the block table, as the search command prints it.
 std::string BlockTableLine(const CBlockProject& project, int index) {
-    const CSimBlockSet& set = project.BlockSet();
-    const CSimBlock& block = *set.BlockAt(index);
-    constexpr CSimBlock::Layout kLayout = CSimBlock::kCurrent;
-    const CBlockSignificance significance = EvaluateBlockSignificance(
-        block, &set, project.Params().Matrix(), project.Params().ExpectationLimit(), kLayout);
-    std::string members;
-    for (int i = 0; i < block.MemberCount(); ++i) {
-        const CSxMolEntry* entry = set.MoleculeAt(block.Member(i));
-        if (!block.IsIncluded(i) || !entry)
-            continue;
-        if (!members.empty())
-            members += ",";
-        members += entry->Name() + ":" + std::to_string(block.Start(kLayout, i) + 1);
-    }
-    return std::to_string(index + 1) + "\t" + block.Name() + "\t" +
-           std::to_string(block.SequenceCount(kLayout)) + "\t" +
-           std::to_string(block.Width(kLayout)) + "\t" +
-           Printf("%.1f", block.MeanPairScore(kLayout)) + "\t" +
-           std::to_string(block.Score(kLayout)) + "\t" + SignificanceWord(significance.state) +
-           "\t" + Printf("%.3e", significance.p) + "\t" +
-           std::to_string(block.LowestStart(kLayout) + 1) + "\t" + members;
+    return BlockTableRow(project.BlockSet(), index, project.Params().Matrix(),
+                         project.Params().ExpectationLimit());
 }
 
 void PrintInfo(const CBlockProject& project, std::ostream& out) {
@@ -100,8 +70,7 @@ void PrintInfo(const CBlockProject& project, std::ostream& out) {
         out << project.MoleculeAt(i)->Name() << "\t" << project.MoleculeAt(i)->SequenceLength()
             << "\n";
     }
-    out << "# blocks\n"
-        << "#block\tname\tm\tlen\tMP-score\tSP-score\tSignif.\tP\tOffset\tmembers\n";
+    out << "# blocks\n" << kBlockTableHeader << "\n";
     for (int b = 0; b < project.BlockSet().BlockCount(); ++b) {
         out << BlockTableLine(project, b) << "\n";
     }

@@ -82,15 +82,12 @@ class ProjectCli : public ::testing::Test {
     void TearDown() override { fs::remove_all(m_dir); }
     std::string Path(const std::string& name) const { return (m_dir / name).string(); }
 
-    // Searches a sequence file and saves the project.
+    // Searches a sequence file from the command line and saves the project.
     std::string SearchedProject(const std::string& fasta, int minSequences) {
-        CBlockProject project;
-        CRecordingPrompt prompt;
-        EXPECT_TRUE(project.AddFile(fasta, prompt));
-        project.Params().SetMinSequences(minSequences);
-        EXPECT_TRUE(project.Search(project.AllMolecules(), RunSearchJob, prompt));
         const std::string path = Path("searched.bpr");
-        project.Save(path);
+        const CRun run = RunTool({"search", fasta, "--min-seqs", std::to_string(minSequences),
+                                  "--save", path, "--quiet"});
+        EXPECT_EQ(run.status, 0) << run.err;
         return path;
     }
 
@@ -217,6 +214,16 @@ TEST_F(ProjectCli, LinkTwoBlocksThenExportMsfWithGcgChecksums) {
         std::replace(expected.begin(), expected.end(), '.', '-');
         EXPECT_EQ(readBack[name], expected) << name;
     }
+}
+
+TEST_F(ProjectCli, SearchMsfMatchesTheSavedProjectsMsf) {
+    const std::string saved = Path("s.bpr");
+    const std::string direct = Path("direct.msf");
+    CRun run = RunTool({"search", Myoglobins(), "--save", saved, "--msf", direct, "--quiet"});
+    ASSERT_EQ(run.status, 0) << run.err;
+    run = RunTool({"msf", saved, Path("later.msf")});
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_EQ(ReadText(direct), ReadText(Path("later.msf")));
 }
 
 TEST_F(ProjectCli, UnlinkDefineBlockAndOutputFile) {
