@@ -133,7 +133,7 @@ void CSimTool::ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& canc
     m_pairOffsets.assign(count, std::vector<std::vector<std::int32_t>>(count));
 
     using COffsets = std::vector<std::int32_t>;
-    const std::function<COffsets(std::size_t)> scan = [&](std::size_t k) {
+    const std::function<COffsets(std::size_t, int)> scan = [&](std::size_t k, int) {
         COffsets offsets;
         scanner.Scan(pairs[k].first, pairs[k].second, offsets);
         return offsets;
@@ -157,32 +157,50 @@ void CSimTool::ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& canc
 bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
     const int total = static_cast<int>(m_hits.size());
     BeginPhase("Expanding diagonals...", 0, total, 1);
-    CDiagonalExpander expander(masks, m_pairOffsets, EffectiveMinSequences());
-    bool lowMemory = false;
-    const std::function<bool()> shouldAbort = [&] {
-        if (IsCancelled())
-            return true;
-        lowMemory = m_heldBytes + expander.FoundBytes() > m_memoryBudget || IsMemoryLow();
-        return lowMemory;
+    const int workers = WorkerCount(m_threadCount);
+    std::vector<CDiagonalExpander> expanders(
+        workers, CDiagonalExpander(masks, m_pairOffsets, EffectiveMinSequences(), m_heldBytes));
+    struct CExpansion {
+        std::vector<CSimDiag> diagonals;
+        bool aborted = false;
+        bool lowMemory = false;
     };
-    for (int k = 0; k < total && !cancelled; ++k) {
-        ReportProgress("Expanding diagonals (hit %d of %d)", k + 1, total);
-        if (!expander.Expand(m_hits[k], shouldAbort, m_diagonals)) {
-            if (lowMemory)
-                return StopLowOnMemory();
-            m_failure = kCancelled;
+    const std::function<CExpansion(std::size_t, int)> expand = [&](std::size_t k, int worker) {
+        CDiagonalExpander& expander = expanders[worker];
+        CExpansion expansion;
+        const std::function<bool()> shouldAbort = [&] {
+            if (IsCancelled())
+                return true;
+            expansion.lowMemory = m_heldBytes.load() > m_memoryBudget || IsMemoryLow();
+            return expansion.lowMemory;
+        };
+        expansion.aborted = !expander.Expand(m_hits[k], shouldAbort, expansion.diagonals);
+        return expansion;
+    };
+    bool stopped = false;
+    const std::function<bool(std::size_t, CExpansion&)> keep = [&](std::size_t k,
+                                                                   CExpansion& expansion) {
+        ReportProgress("Expanding diagonals (hit %d of %d)", static_cast<int>(k) + 1, total);
+        if (expansion.aborted) {
+            if (expansion.lowMemory)
+                StopLowOnMemory();
+            else
+                m_failure = kCancelled;
+            stopped = true;
             return false;
         }
-        m_heldBytes += expander.FoundBytes();
+        m_diagonals.insert(m_diagonals.end(), std::make_move_iterator(expansion.diagonals.begin()),
+                           std::make_move_iterator(expansion.diagonals.end()));
         cancelled = StepProgress();
-    }
-    return true;
+        return !cancelled;
+    };
+    RunInOrder(workers, m_hits.size(), expand, keep);
+    return !stopped;
 }
 
-bool CSimTool::StopLowOnMemory() {
+void CSimTool::StopLowOnMemory() {
     ShowMessage(kLowMemoryMessage);
     m_failure = kLowMemory;
-    return false;
 }
 
 bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
@@ -192,23 +210,38 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
     for (const CSimMol& molecule : m_molecules)
         sequences.push_back(&molecule.Codes());
     const int longest = LongestSequenceLength();
-    CJoinedRunCache joins(sequences, grid, m_cutoff);
-    std::vector<CBlockCandidate> candidates;
+    const int workers = WorkerCount(m_threadCount);
+    std::vector<CJoinedRunCache> joins(workers, CJoinedRunCache(sequences, grid, m_cutoff));
+    using CCandidates = std::vector<CBlockCandidate>;
+    const std::function<CCandidates(std::size_t, int)> scan = [&](std::size_t k, int worker) {
+        CCandidates candidates;
+        ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins[worker], candidates);
+        return candidates;
+    };
     std::vector<std::unique_ptr<CSimBlock>> blocks;
-    for (int k = 0; k < total && !cancelled; ++k) {
-        ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)", k + 1, total);
-        candidates.clear();
-        ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins, candidates);
+    bool stopped = false;
+    const std::function<bool(std::size_t, CCandidates&)> make = [&](std::size_t k,
+                                                                    CCandidates& candidates) {
+        ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)",
+                       static_cast<int>(k) + 1, total);
+        // Made here, in diagonal order, so that identifiers follow the order blocks are made.
         for (const CBlockCandidate& candidate : candidates) {
             blocks.push_back(std::make_unique<CSimBlock>());
             blocks.back()->Init(candidate.molecules, candidate.starts, candidate.width,
                                 candidate.score, 0);
             m_heldBytes += BlockBytes(candidate.molecules.size());
         }
-        if (m_heldBytes > m_memoryBudget || IsMemoryLow())
-            return StopLowOnMemory();
+        if (m_heldBytes.load() > m_memoryBudget || IsMemoryLow()) {
+            StopLowOnMemory();
+            stopped = true;
+            return false;
+        }
         cancelled = StepProgress();
-    }
+        return !cancelled;
+    };
+    RunInOrder(workers, m_diagonals.size(), scan, make);
+    if (stopped)
+        return false;
     m_result->AddBlocksSorted(std::move(blocks));
     return true;
 }

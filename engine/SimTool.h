@@ -85,12 +85,13 @@ class CSimTool {
     // printf-style progress text; the base does nothing. Overrides can use FormatText().
     virtual void ReportProgress(const char* format, ...) __attribute__((format(printf, 2, 3)));
     virtual void SetStatusText(const std::string& text);
-    // The base answers whether RequestCancel() was called.
+    // The base answers whether RequestCancel() was called. Called from the worker threads of
+    // the search too: overrides must be thread-safe (read an atomic flag).
     virtual bool IsCancelled();
     // A message the user must see (low memory): the GUI shows a box, the command line prints it.
     virtual void ShowMessage(const std::string& message);
     // Whether the system is low on memory; the base reads the system figures, at most a few
-    // times a second.
+    // times a second. Called from the worker threads of the search too.
     virtual bool IsMemoryLow();
 
     static std::string FormatText(const char* format, va_list args);
@@ -103,7 +104,7 @@ class CSimTool {
     bool ScanDiagonals(const CScoreGrid& grid, bool& cancelled);
     int Fail(Failure failure);
     // Stops the run as low on memory: shows the message and records the failure.
-    bool StopLowOnMemory();
+    void StopLowOnMemory();
     int EffectiveMinSequences() const;
 
     std::unique_ptr<CScoreMatrix> m_matrix;
@@ -117,7 +118,8 @@ class CSimTool {
     int m_failedMolecule = -1;
     std::unique_ptr<CMemoryWatch> m_memoryWatch;
     std::size_t m_memoryBudget = kDefaultMemoryBudget;
-    std::size_t m_heldBytes = 0;  // held by the kept diagonals and the blocks made so far
+    // Held by the kept diagonals and the blocks made so far; read by the workers.
+    std::atomic<std::size_t> m_heldBytes{0};
     std::vector<CSimHit> m_hits;
     std::vector<CSimDiag> m_diagonals;
     // Hit offsets per pair a < b, ascending: pairOffsets[a][b].

@@ -42,15 +42,17 @@ bool ComesBefore(const CSimDiag& a, const CSimDiag& b) {
 
 CDiagonalExpander::CDiagonalExpander(
     const CHitMasks& masks, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-    int minSequences)
-    : m_masks(masks), m_pairOffsets(pairOffsets), m_minSequences(minSequences) {}
+    int minSequences, std::atomic<std::size_t>& foundBytes)
+    : m_masks(masks),
+      m_pairOffsets(pairOffsets),
+      m_minSequences(minSequences),
+      m_foundBytes(foundBytes) {}
 
 bool CDiagonalExpander::Expand(const CSimHit& hit, const std::function<bool()>& shouldAbort,
                                std::vector<CSimDiag>& kept) {
     m_hit = hit;
     m_shouldAbort = &shouldAbort;
     m_found.clear();
-    m_foundBytes = 0;
     CollectPlacements(hit);
     if (m_candidateCount + 2 < m_minSequences || SomeExcludedJoinsEveryCandidate()) {
         // No diagonal of this hit can be kept; the search would only find that out slowly.

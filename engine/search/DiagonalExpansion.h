@@ -11,6 +11,7 @@
 // their (member, offset) sequences, the order in which a depth-first expansion that adds
 // molecules in increasing order, and offsets in increasing order, would keep them.
 
+#include <atomic>
 #include <cstdint>
 #include <functional>
 #include <vector>
@@ -20,17 +21,17 @@
 
 class CDiagonalExpander {
   public:
-    // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order.
+    // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order. The
+    // approximate memory of every diagonal found is added to `foundBytes` (shared by the
+    // expanders of one search, so a budget can be watched while they run).
     CDiagonalExpander(const CHitMasks& masks,
                       const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-                      int minSequences);
+                      int minSequences, std::atomic<std::size_t>& foundBytes);
 
     // Appends the diagonals of `hit` to `kept`. `shouldAbort` is asked at every step of the
     // search; when it answers true nothing more is appended and the result is false.
     bool Expand(const CSimHit& hit, const std::function<bool()>& shouldAbort,
                 std::vector<CSimDiag>& kept);
-    // The approximate memory of the diagonals found so far for the current hit.
-    std::size_t FoundBytes() const { return m_foundBytes; }
     static std::size_t BytesOf(const CSimDiag& diagonal);
 
   private:
@@ -62,5 +63,5 @@ class CDiagonalExpander {
     std::size_t m_words = 0;
     std::vector<std::uint64_t> m_adjacency;  // m_words per placement
     std::vector<CSimDiag> m_found;
-    std::size_t m_foundBytes = 0;
+    std::atomic<std::size_t>& m_foundBytes;
 };

@@ -28,6 +28,7 @@ bool IsLowOnMemory(const CMemoryFigures& figures) {
 }
 
 bool CMemoryWatch::IsLow() {
+    const std::lock_guard<std::mutex> lock(m_mutex);
     const auto now = std::chrono::steady_clock::now();
     if (m_read && now - m_lastRead < m_interval)
         return m_low;

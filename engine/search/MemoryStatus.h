@@ -4,6 +4,7 @@
 
 #include <chrono>
 #include <cstdint>
+#include <mutex>
 #include <optional>
 #include <string>
 
@@ -17,7 +18,7 @@ std::optional<CMemoryFigures> ParseMemInfo(const std::string& text);
 // Less than a twentieth of all memory is still available.
 bool IsLowOnMemory(const CMemoryFigures& figures);
 
-// The low-memory state, refreshed from the system at most every `interval`.
+// The low-memory state, refreshed from the system at most every `interval`. Thread-safe.
 class CMemoryWatch {
   public:
     explicit CMemoryWatch(std::chrono::milliseconds interval = std::chrono::milliseconds(100))
@@ -25,6 +26,7 @@ class CMemoryWatch {
     bool IsLow();
 
   private:
+    std::mutex m_mutex;
     std::chrono::milliseconds m_interval;
     std::chrono::steady_clock::time_point m_lastRead{};
     bool m_read = false;

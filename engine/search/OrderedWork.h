@@ -19,15 +19,16 @@ inline int WorkerCount(int requested) {
     return std::max(1u, std::thread::hardware_concurrency());
 }
 
-// Calls task(i) for every i on `threads` workers and consume(i, result) on this thread for
-// i = 0, 1, ... in order. When consume returns false, tasks not yet started are skipped and the
-// result is false. An exception of a task is rethrown here when its result is due.
+// Calls task(i, worker) for every i on `threads` workers (worker = 0 .. threads - 1, so tasks
+// can keep per-worker state) and consume(i, result) on this thread for i = 0, 1, ... in order.
+// When consume returns false, tasks not yet started are skipped and the result is false. An
+// exception of a task is rethrown here when its result is due.
 template <class Result>
-bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::size_t)>& task,
+bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::size_t, int)>& task,
                 const std::function<bool(std::size_t, Result&)>& consume) {
     if (threads <= 1 || count <= 1) {
         for (std::size_t i = 0; i < count; ++i) {
-            Result result = task(i);
+            Result result = task(i, 0);
             if (!consume(i, result))
                 return false;
         }
@@ -41,13 +42,13 @@ bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::
     std::unique_ptr<CSlot[]> slots(new CSlot[count]);
     std::atomic<std::size_t> next{0};
     std::atomic<bool> stop{false};
-    auto work = [&] {
+    auto work = [&](int worker) {
         for (;;) {
             const std::size_t i = next.fetch_add(1);
             if (i >= count || stop.load(std::memory_order_relaxed))
                 return;
             try {
-                slots[i].result.emplace(task(i));
+                slots[i].result.emplace(task(i, worker));
             } catch (...) {
                 slots[i].error = std::current_exception();
             }
@@ -58,7 +59,7 @@ bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::
     std::vector<std::thread> workers;
     const int used = static_cast<int>(std::min<std::size_t>(threads, count));
     for (int t = 0; t < used; ++t)
-        workers.emplace_back(work);
+        workers.emplace_back(work, t);
 
     bool completed = true;
     std::exception_ptr error;

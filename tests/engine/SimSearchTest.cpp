@@ -265,6 +265,17 @@ TEST(SimTool, LowMemoryDuringExpansionShowsTheMessageOnceAndFails) {
                                        "Unable to proceed with block searching."});
     EXPECT_EQ(search.tool->LastFailure(), CSimTool::kLowMemory);
     EXPECT_TRUE(search.tool->Diagonals().empty());
+
+    // The same when the search's own diagonals and blocks outgrow its budget.
+    for (int threads : {1, 2}) {
+        CSearch overBudget({"WWWK", "KWWW", "KKWWW", "WWWKK"}, 33, 2);
+        overBudget.tool->SetThreadCount(threads);
+        overBudget.tool->SetMemoryBudget(1);
+        EXPECT_EQ(overBudget.tool->Run(), 0);
+        EXPECT_EQ(overBudget.tool->messages.size(), 1u);
+        EXPECT_EQ(overBudget.tool->LastFailure(), CSimTool::kLowMemory);
+        EXPECT_EQ(overBudget.result.BlockCount(), 0);
+    }
 }
 
 TEST(SimTool, SixtyFourMoleculesMakeOneSixtyFourMemberDiagonalAndMoreAreRefused) {
