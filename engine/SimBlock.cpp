@@ -122,7 +122,7 @@ int CSimBlock::LayoutScoreOfSequences(Layout layout,
     }
     const CScoreGrid grid = GridOf(matrix);
     // The residue of member i at column c, or 0 when there is none (adds nothing).
-    auto residue = [&](int i, int c) -> std::uint8_t {
+    auto residue = [&](int i, long c) -> std::uint8_t {
         const int molecule = m_members[i];
         if (molecule < 0 || molecule >= static_cast<int>(encoded.size()))
             return 0;
@@ -132,8 +132,22 @@ int CSimBlock::LayoutScoreOfSequences(Layout layout,
             return 0;
         return codes[position];
     };
-    int score = 0;
-    for (int c = 0; c < m_width[layout]; ++c) {
+    // Only columns where some member has a residue can add anything (a stored width may be
+    // far larger than any sequence).
+    long firstColumn = m_width[layout];
+    long endColumn = 0;
+    for (int u = 0; u < MemberCount(); ++u) {
+        const int molecule = m_members[u];
+        if (!InLayout(layout, u) || molecule < 0 || molecule >= static_cast<int>(encoded.size()))
+            continue;
+        const long offset = static_cast<long>(Start(layout, u)) + shift;
+        firstColumn = std::min(firstColumn, std::max(0L, -offset));
+        endColumn = std::max(
+            endColumn,
+            std::min<long>(m_width[layout], static_cast<long>(encoded[molecule].size()) - offset));
+    }
+    long score = 0;
+    for (long c = firstColumn; c < endColumn; ++c) {
         for (int u = 0; u < MemberCount(); ++u) {
             if (!InLayout(layout, u))
                 continue;
@@ -149,7 +163,7 @@ int CSimBlock::LayoutScoreOfSequences(Layout layout,
             }
         }
     }
-    return score;
+    return static_cast<int>(score);
 }
 
 bool CSimBlock::IsUnedited() const {
