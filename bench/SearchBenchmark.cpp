@@ -33,7 +33,8 @@ std::vector<CSxMolEntry> RandomSet(int count, int length) {
     std::mt19937 random(1);
     std::vector<CSxMolEntry> molecules;
     for (int i = 0; i < count; ++i)
-        molecules.emplace_back("r" + std::to_string(i), "r" + std::to_string(i), RandomProtein(random, length));
+        molecules.emplace_back("r" + std::to_string(i), "r" + std::to_string(i),
+                               RandomProtein(random, length));
     return molecules;
 }
 
@@ -111,18 +112,18 @@ BENCHMARK(BM_PairScanScalar);
 
 // The engine with the time of each phase.
 class CPhaseTimer : public CSimTool {
-public:
+  public:
     using CSimTool::CSimTool;
     std::vector<double> seconds;
 
-protected:
+  protected:
     void BeginPhase(const std::string&, int, int, int) override { Lap(); }
     int Finish(int ok) override {
         Lap();
         return ok;
     }
 
-private:
+  private:
     void Lap() {
         const auto now = std::chrono::steady_clock::now();
         if (m_started)
@@ -163,7 +164,9 @@ void RunSearch(benchmark::State& state, const std::vector<CSxMolEntry>& molecule
     state.counters["blocks"] = static_cast<double>(blocks);
 }
 
-void BM_SearchRandom64x1000(benchmark::State& state) { RunSearch(state, RandomSet(64, 1000)); }
+void BM_SearchRandom64x1000(benchmark::State& state) {
+    RunSearch(state, RandomSet(64, 1000));
+}
 BENCHMARK(BM_SearchRandom64x1000)->Arg(1)->Arg(2)->Unit(benchmark::kMillisecond);
 
 // The second argument seeds the base sequence. Seed 2 gives a base with little self-similarity;
@@ -173,8 +176,11 @@ BENCHMARK(BM_SearchRandom64x1000)->Arg(1)->Arg(2)->Unit(benchmark::kMillisecond)
 void BM_SearchFamily64x500(benchmark::State& state) {
     RunSearch(state, MutatedCopies(64, 500, static_cast<unsigned>(state.range(1))));
 }
-BENCHMARK(BM_SearchFamily64x500)->Args({1, 2})->Args({2, 2})->Args({2, 1})->Unit(
-    benchmark::kMillisecond);
+BENCHMARK(BM_SearchFamily64x500)
+    ->Args({1, 2})
+    ->Args({2, 2})
+    ->Args({2, 1})
+    ->Unit(benchmark::kMillisecond);
 
 void BM_SearchGlobins45(benchmark::State& state) {
     RunSearch(state, ReadFasta(TB_EXAMPLES_DIR "/globins45.fa"));
