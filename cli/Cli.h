@@ -13,12 +13,12 @@ enum CliStatus { kCliDone = 0, kCliSearchFailed = 1, kCliBadInput = 2 };
 
 // A command failed: `what()` goes to stderr and the tool exits with `status`.
 class CCliError : public std::runtime_error {
-public:
+  public:
     CCliError(int status, const std::string& message)
         : std::runtime_error(message), m_status(status) {}
     int Status() const { return m_status; }
 
-private:
+  private:
     int m_status;
 };
 

@@ -80,16 +80,7 @@ bool CBlockProject::IsBlockProjectData(std::span<const std::uint8_t> bytes) {
 }
 
 std::unique_ptr<CBlockProject> CBlockProject::FromBytes(std::span<const std::uint8_t> bytes) {
-    if (!IsBlockProjectData(bytes))
-        return nullptr;
-    CArchive ar = CArchive::ForReading(bytes);
-    std::string tag;
-    ar.XMember(tag);
-    std::unique_ptr<CBlockProject> project;
-    ar.XPointer(project);
-    if (!project)
-        throw CArchiveException(CArchiveException::genericError, "no project");
-    return project;
+    return CArchive::ReadSigned<CBlockProject>(bytes, kFileTag);
 }
 
 std::unique_ptr<CBlockProject> CBlockProject::Load(const std::string& path) {

@@ -80,15 +80,10 @@ bool CQuilterParams::LoadTemplate(const std::string& path, IUserPrompt* prompt) 
 }
 
 bool CQuilterParams::ReadTemplateBytes(std::span<const std::uint8_t> bytes) {
-    if (CArchive::LeadingString(bytes) != kTemplateTag)
-        return false;
-    CArchive ar = CArchive::ForReading(bytes);
-    std::string tag;
-    ar.XMember(tag);
-    std::unique_ptr<CQuilterParams> read;
-    ar.XPointer(read);
+    std::unique_ptr<CQuilterParams> read =
+        CArchive::ReadSigned<CQuilterParams>(bytes, kTemplateTag);
     if (!read)
-        throw CArchiveException(CArchiveException::genericError, "no parameters");
+        return false;
     *this = *read;
     return true;
 }

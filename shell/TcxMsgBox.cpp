@@ -75,8 +75,9 @@ int CTcxMsgBox::Show(QWidget* parent, const QString& text, unsigned type) {
     }
     const std::vector<ButtonSpec> specs = ButtonsFor(type);
     std::vector<std::pair<QPushButton*, int>> buttons;
-    for (const ButtonSpec& spec : specs) {
-        buttons.emplace_back(box.addButton(QString::fromLatin1(spec.text), spec.role), spec.result);
+    for (const ButtonSpec& button : specs) {
+        buttons.emplace_back(box.addButton(QString::fromLatin1(button.text), button.role),
+                             button.result);
     }
     box.setDefaultButton(buttons.front().first);
     box.setEscapeButton(buttons.back().first);

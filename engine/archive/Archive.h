@@ -23,7 +23,7 @@ class CArchive;
 
 // Base of every class that is stored through the archive.
 class CSerializable {
-public:
+  public:
     virtual ~CSerializable() = default;
     // The tag that names the class in a file ("ScoreMatrix", "SimBlock", ...).
     virtual const char* ClassTag() const = 0;
@@ -31,12 +31,14 @@ public:
 };
 
 // Declares the class tag inside a class body.
-#define TB_CLASS_TAG(tag)                                 \
-    static constexpr const char* kClassTag = tag;         \
-    const char* ClassTag() const override { return tag; }
+#define TB_CLASS_TAG(tag)                         \
+    static constexpr const char* kClassTag = tag; \
+    const char* ClassTag() const override {       \
+        return tag;                               \
+    }
 
 class CArchiveException : public std::runtime_error {
-public:
+  public:
     enum Cause {
         genericError,  // malformed data: bad length, impossible count, bad text
         endOfFile,     // the data ends inside a member or record
@@ -50,14 +52,14 @@ public:
     // The text shown to the user for a failure while reading or writing `fileName`.
     std::string Report(const std::string& fileName) const;
 
-private:
+  private:
     Cause m_cause;
 };
 
 // Registry from class tag to a factory, filled by static CClassLink objects that live in the
 // source file of each stored class.
 class CClassRegistry {
-public:
+  public:
     using Factory = std::function<std::unique_ptr<CSerializable>()>;
     static void Add(const std::string& tag, Factory factory);
     // Null when the tag is unknown.
@@ -72,12 +74,12 @@ struct CClassLink {
 };
 
 // Registers Class under its kClassTag; put it in the class's source file.
-#define TB_REGISTER_CLASS(Class)                        \
-    static const CClassLink g_classLink_##Class(        \
-        Class::kClassTag, [] { return std::make_unique<Class>(); })
+#define TB_REGISTER_CLASS(Class)                                  \
+    static const CClassLink g_classLink_##Class(Class::kClassTag, \
+                                                [] { return std::make_unique<Class>(); })
 
 class CArchive {
-public:
+  public:
     enum class Code : std::uint8_t {
         Int16 = 1,
         Int32 = 2,
@@ -137,7 +139,8 @@ public:
         try {
             object.Serialize(*this);
         } catch (const CArchiveException&) {
-            if (IsStoring()) throw;
+            if (IsStoring())
+                throw;
             m_recordEnds.resize(depth);
             m_pos = m_recordEnds.back();
             m_recordEnds.pop_back();
@@ -177,7 +180,8 @@ public:
         std::size_t count = list.size();
         XCount(count, 1);
         if (IsStoring()) {
-            for (auto& element : list) XPointer(element);
+            for (auto& element : list)
+                XPointer(element);
             return;
         }
         for (std::size_t i = 0; i < count; ++i) {
@@ -185,6 +189,26 @@ public:
             XPointer(element);
             list.push_back(std::move(element));
         }
+    }
+
+    // Reads data made of the string `signature` followed by one owned object of class T (the
+    // layout of the program's files). Null when the data does not begin with the signature; a
+    // missing object or damaged data is a format error.
+    template <class T>
+    static std::unique_ptr<T> ReadSigned(std::span<const std::uint8_t> data,
+                                         const std::string& signature) {
+        if (LeadingString(data) != signature)
+            return nullptr;
+        CArchive ar = ForReading(data);
+        std::string found;
+        ar.XMember(found);
+        std::unique_ptr<T> object;
+        ar.XPointer(object);
+        if (!object) {
+            throw CArchiveException(CArchiveException::genericError,
+                                    std::string("no ") + T::kClassTag + " after the signature");
+        }
+        return object;
     }
 
     // On reading: the current record (or, at top level, the data) has no further members.
@@ -197,7 +221,7 @@ public:
     // not begin with a string member. Used to recognise files by their signature.
     static std::string LeadingString(std::span<const std::uint8_t> data);
 
-private:
+  private:
     explicit CArchive(bool loading) : m_loading(loading) {}
 
     void BeginRecord();
@@ -219,7 +243,7 @@ private:
 
     bool m_loading;
     std::vector<std::uint8_t> m_buffer;
-    std::size_t m_pos = 0;                   // read position
-    std::vector<std::size_t> m_recordEnds;   // reading: end offsets of the open records
-    std::vector<std::size_t> m_recordStarts; // writing: offsets of the open records' lengths
+    std::size_t m_pos = 0;                    // read position
+    std::vector<std::size_t> m_recordEnds;    // reading: end offsets of the open records
+    std::vector<std::size_t> m_recordStarts;  // writing: offsets of the open records' lengths
 };

@@ -35,7 +35,8 @@ std::string LocusLine(const CSxMol& molecule) {
     } else {
         // LOCUS holds one word: "genomic DNA" is written as "DNA".
         std::string type = desc.moleculeType.substr(desc.moleculeType.find_last_of(' ') + 1);
-        if (type.empty()) type = "DNA";
+        if (type.empty())
+            type = "DNA";
         std::snprintf(text, sizeof text, "    %-7s %-8s", type.c_str(),
                       molecule.IsLinear() ? "linear" : "circular");
         line += text;

@@ -8,25 +8,16 @@
 #include <random>
 #include <sstream>
 
-#include "Cli.h"
+#include "cli/CliRun.h"
 #include "engine/MatrixReference.h"
 
 namespace fs = std::filesystem;
 
 namespace {
 
-struct CliRun {
-    int status;
-    std::string out;
-    std::string err;
-};
-
-CliRun Matrix(std::vector<std::string> args) {
+CRun Matrix(std::vector<std::string> args) {
     args.insert(args.begin(), "matrix");
-    std::ostringstream out;
-    std::ostringstream err;
-    const int status = RunCli(args, out, err);
-    return {status, out.str(), err.str()};
+    return RunTool(args);
 }
 
 // "key: value" lines as a map.
@@ -84,7 +75,7 @@ class TempDir {
 }  // namespace
 
 TEST(MatrixCli, ListsTheBuiltinNamesInOrder) {
-    const CliRun run = Matrix({"list"});
+    const CRun run = Matrix({"list"});
     EXPECT_EQ(run.status, kCliDone);
     std::string expected;
     for (const std::string& name : ReferenceMatrixNames())
@@ -94,7 +85,7 @@ TEST(MatrixCli, ListsTheBuiltinNamesInOrder) {
 
 TEST(MatrixCli, ShowGivesEveryBuiltinTableInTheFileLayout) {
     for (const std::string& name : ReferenceMatrixNames()) {
-        const CliRun run = Matrix({"show", name});
+        const CRun run = Matrix({"show", name});
         ASSERT_EQ(run.status, kCliDone) << name << run.err;
         EXPECT_EQ(run.out.substr(0, run.out.find('\n', run.out.find('\n') + 1) + 1),
                   "#  Matrix made by Tiler\n#  " + name + "\n");
@@ -117,7 +108,7 @@ TEST(MatrixCli, InfoGivesCutoffsAndWindowScore) {
     const std::map<std::string, std::string> cutoffs = ReadmeCutoffs();
     ASSERT_EQ(cutoffs.size(), 18u);
     for (const std::string& name : ReferenceMatrixNames()) {
-        const CliRun run = Matrix({"info", name});
+        const CRun run = Matrix({"info", name});
         ASSERT_EQ(run.status, kCliDone) << name << run.err;
         auto info = InfoOf(run.out);
         const bool nucleotide = name.find("dna") != std::string::npos;
@@ -136,7 +127,7 @@ TEST(MatrixCli, FilesAreShownAsTheWriterWritesThem) {
     const std::string path = dir.File("family.mat",
                                       "# my matrix\n A R\nA 4,-1\nR -1 5\n"
                                       "3 0.25 0.05 *\n4 0.5 0.125\n");
-    const CliRun show = Matrix({"show", path});
+    const CRun show = Matrix({"show", path});
     ASSERT_EQ(show.status, kCliDone) << show.err;
     EXPECT_EQ(show.out.substr(0, show.out.find("#  Statistical")),
               "#  Matrix made by Tiler\n#  family\n   A  R\nA  4 -1\nR -1  5\n\n");
@@ -144,7 +135,7 @@ TEST(MatrixCli, FilesAreShownAsTheWriterWritesThem) {
               std::string::npos);
 
     // What show prints reads back to the same output.
-    const CliRun again = Matrix({"show", dir.File("family.txt", show.out)});
+    const CRun again = Matrix({"show", dir.File("family.txt", show.out)});
     EXPECT_EQ(again.out, show.out);
 
     const auto info = InfoOf(Matrix({"info", path}).out);
@@ -166,7 +157,7 @@ TEST(MatrixCli, UnknownNamesAndBadFilesExitWithStatusTwo) {
         {"frobnicate"},
     };
     for (const auto& args : bad) {
-        const CliRun run = Matrix(args);
+        const CRun run = Matrix(args);
         EXPECT_EQ(run.status, kCliBadInput) << args[0];
         EXPECT_EQ(run.out, "") << args[0];
         EXPECT_FALSE(run.err.empty()) << args[0];

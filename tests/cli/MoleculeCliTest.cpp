@@ -7,24 +7,11 @@
 #include <fstream>
 #include <sstream>
 
-#include "Cli.h"
+#include "cli/CliRun.h"
 
 namespace fs = std::filesystem;
 
 namespace {
-
-struct CRun {
-    int status;
-    std::string out;
-    std::string err;
-};
-
-CRun RunTool(const std::vector<std::string>& args) {
-    std::ostringstream out;
-    std::ostringstream err;
-    int status = RunCli(args, out, err);
-    return {status, out.str(), err.str()};
-}
 
 std::string Fixture(const std::string& name) {
     return std::string(TB_TEST_DATA_DIR) + "/sequences/" + name;

@@ -9,25 +9,12 @@
 #include <sstream>
 
 #include "BlockProject.h"
-#include "Cli.h"
 #include "archive/FileIO.h"
+#include "cli/CliRun.h"
 
 namespace fs = std::filesystem;
 
 namespace {
-
-struct CRun {
-    int status;
-    std::string out;
-    std::string err;
-};
-
-CRun RunTool(const std::vector<std::string>& args) {
-    std::ostringstream out;
-    std::ostringstream err;
-    const int status = RunCli(args, out, err);
-    return {status, out.str(), err.str()};
-}
 
 std::string ReadText(const std::string& path) {
     const std::vector<std::uint8_t> bytes = ReadWholeFile(path);

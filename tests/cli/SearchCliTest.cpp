@@ -12,29 +12,16 @@
 #include <regex>
 #include <sstream>
 
-#include "Cli.h"
 #include "QuilterParams.h"
 #include "ScoreMatrix.h"
 #include "archive/FileIO.h"
+#include "cli/CliRun.h"
 
 namespace fs = std::filesystem;
 
 namespace {
 
 const std::string kGlobins = TB_TEST_DATA_DIR "/../../resources/examples/globins.fa";
-
-struct CRun {
-    int status;
-    std::string out;
-    std::string err;
-};
-
-CRun RunTool(const std::vector<std::string>& args) {
-    std::ostringstream out;
-    std::ostringstream err;
-    const int status = RunCli(args, out, err);
-    return {status, out.str(), err.str()};
-}
 
 std::vector<std::string> Split(const std::string& text, char separator) {
     std::vector<std::string> parts;
