@@ -7,6 +7,7 @@
 #include <benchmark/benchmark.h>
 
 #include <chrono>
+#include <cstdlib>
 #include <fstream>
 #include <random>
 
@@ -29,12 +30,18 @@ std::string RandomProtein(std::mt19937& random, int length) {
     return text;
 }
 
+// Built by appending: GCC 12 warns falsely about `"r" + std::to_string(i)` at -O2.
+std::string NameOf(char prefix, int index) {
+    std::string name(1, prefix);
+    name += std::to_string(index);
+    return name;
+}
+
 std::vector<CSxMolEntry> RandomSet(int count, int length) {
     std::mt19937 random(1);
     std::vector<CSxMolEntry> molecules;
     for (int i = 0; i < count; ++i)
-        molecules.emplace_back("r" + std::to_string(i), "r" + std::to_string(i),
-                               RandomProtein(random, length));
+        molecules.emplace_back(NameOf('r', i), NameOf('r', i), RandomProtein(random, length));
     return molecules;
 }
 
@@ -50,7 +57,7 @@ std::vector<CSxMolEntry> MutatedCopies(int count, int length, unsigned seed) {
             if (chance(random) < 0.05)
                 c = RandomProtein(random, 1)[0];
         }
-        molecules.emplace_back("f" + std::to_string(i), "f" + std::to_string(i), copy);
+        molecules.emplace_back(NameOf('f', i), NameOf('f', i), copy);
     }
     return molecules;
 }
@@ -186,6 +193,13 @@ void BM_SearchGlobins45(benchmark::State& state) {
     RunSearch(state, ReadFasta(TB_EXAMPLES_DIR "/globins45.fa"));
 }
 BENCHMARK(BM_SearchGlobins45)->Arg(1)->Arg(2)->Unit(benchmark::kMillisecond);
+
+// Any FASTA file named by TB_BENCH_FASTA (compare_tools.sh passes the protein kinases).
+void BM_SearchFile(benchmark::State& state) {
+    const char* path = std::getenv("TB_BENCH_FASTA");
+    RunSearch(state, path != nullptr ? ReadFasta(path) : std::vector<CSxMolEntry>{});
+}
+BENCHMARK(BM_SearchFile)->Arg(1)->Arg(2)->Unit(benchmark::kMillisecond);
 
 }  // namespace
 

@@ -180,6 +180,8 @@ std::string FailureText(const CSearchOutcome& outcome, const CBlockProject& proj
         case CSimTool::kLowMemory:
         case CSimTool::kOutOfMemory:
             return "not enough memory for its diagonals and blocks";
+        case CSimTool::kTooManyDiagonals:
+            return "the molecules match at too many offsets (a higher --cutoff helps)";
         default:
             return "the search did not complete";
     }

@@ -29,10 +29,18 @@ void CSimBlock::ReserveIdentifier(int identifier) {
 
 void CSimBlock::Init(std::span<const std::int32_t> members, std::span<const std::int32_t> starts,
                      int width, int score, int flag) {
+    Init(std::vector<std::int32_t>(members.begin(), members.end()),
+         std::vector<std::int32_t>(starts.begin(), starts.begin() + members.size()), width, score,
+         flag);
+}
+
+void CSimBlock::Init(std::vector<std::int32_t>&& members, std::vector<std::int32_t>&& starts,
+                     int width, int score, int flag) {
     m_width[kOriginal] = width;
     m_score[kOriginal] = score;
-    m_members.assign(members.begin(), members.end());
-    m_originalStarts.assign(starts.begin(), starts.begin() + members.size());
+    starts.resize(members.size());
+    static_cast<std::vector<std::int32_t>&>(m_members) = std::move(members);
+    static_cast<std::vector<std::int32_t>&>(m_originalStarts) = std::move(starts);
     m_flag = flag;
     ResetCurrentLayout();
 }
@@ -185,12 +193,11 @@ bool CSimBlock::operator==(const CSimBlock& other) const {
            m_currentStarts == other.m_currentStarts && m_included == other.m_included;
 }
 
-bool CSimBlock::IsGreater(const CSimBlock& other) const {
+std::int64_t CSimBlock::OrderKey() const {
+    // The count above, the score (shifted to be non-negative) in the lower 32 bits.
     const auto count = static_cast<std::int16_t>(MemberCount());
-    const auto otherCount = static_cast<std::int16_t>(other.MemberCount());
-    if (count != otherCount)
-        return count > otherCount;
-    return m_score[kOriginal] > other.m_score[kOriginal];
+    const std::int64_t score = std::int64_t{m_score[kOriginal]} - INT32_MIN;
+    return (std::int64_t{count} << 32) + score;
 }
 
 void CSimBlock::Serialize(CArchive& ar) {

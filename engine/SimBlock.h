@@ -33,6 +33,9 @@ class CSimBlock : public CSerializable {
     // are 0-based positions) and the flag, then resets the current layout to it.
     void Init(std::span<const std::int32_t> members, std::span<const std::int32_t> starts,
               int width, int score, int flag);
+    // The same, taking the arrays over (a search makes blocks by the ten thousand).
+    void Init(std::vector<std::int32_t>&& members, std::vector<std::int32_t>&& starts, int width,
+              int score, int flag);
     // Current starts, width and score become the original ones; every member is included.
     void ResetCurrentLayout();
 
@@ -90,7 +93,9 @@ class CSimBlock : public CSerializable {
     bool operator==(const CSimBlock& other) const;
     // The block-set order: more original members (as 16-bit counts), or as many and a higher
     // original score.
-    bool IsGreater(const CSimBlock& other) const;
+    bool IsGreater(const CSimBlock& other) const { return OrderKey() > other.OrderKey(); }
+    // A number that orders blocks as IsGreater() does.
+    std::int64_t OrderKey() const;
 
     void Serialize(CArchive& ar) override;
 

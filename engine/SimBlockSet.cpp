@@ -60,6 +60,26 @@ int CSimBlockSet::AddBlockSorted(std::unique_ptr<CSimBlock> block) {
     return index;
 }
 
+namespace {
+
+// A stable sort by OrderKey(), descending, on the keys alone: comparing through the pointers
+// would reach into every block at each comparison.
+void SortInBlockOrder(std::vector<std::unique_ptr<CSimBlock>>& blocks) {
+    std::vector<std::pair<std::int64_t, std::size_t>> keys;
+    keys.reserve(blocks.size());
+    for (std::size_t i = 0; i < blocks.size(); ++i)
+        keys.emplace_back(blocks[i]->OrderKey(), i);
+    std::stable_sort(keys.begin(), keys.end(),
+                     [](const auto& a, const auto& b) { return a.first > b.first; });
+    std::vector<std::unique_ptr<CSimBlock>> sorted;
+    sorted.reserve(blocks.size());
+    for (const auto& key : keys)
+        sorted.push_back(std::move(blocks[key.second]));
+    blocks = std::move(sorted);
+}
+
+}  // namespace
+
 void CSimBlockSet::AddBlocksSorted(std::vector<std::unique_ptr<CSimBlock>> blocks) {
     auto& existing = m_blocks.items;
     auto greater = [](const auto& a, const auto& b) { return a->IsGreater(*b); };
@@ -70,7 +90,7 @@ void CSimBlockSet::AddBlocksSorted(std::vector<std::unique_ptr<CSimBlock>> block
             AddBlockSorted(std::move(block));
         return;
     }
-    std::stable_sort(blocks.begin(), blocks.end(), greater);
+    SortInBlockOrder(blocks);
     std::vector<std::unique_ptr<CSimBlock>> merged;
     merged.reserve(existing.size() + blocks.size());
     std::merge(std::make_move_iterator(existing.begin()), std::make_move_iterator(existing.end()),

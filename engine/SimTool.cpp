@@ -28,6 +28,10 @@ std::size_t BlockBytes(std::size_t members) {
 
 const char* const CSimTool::kLowMemoryMessage =
     "Your system is getting low of virtual memory.\nUnable to proceed with block searching.";
+const char* const CSimTool::kTooManyDiagonalsMessage =
+    "The molecules match each other at so many offsets that the search would find more "
+    "diagonals and blocks than memory can hold.\nRaise the pairwise score cutoff, or search "
+    "fewer closely related molecules.";
 
 std::string CSimTool::TooManyMoleculesMessage(std::size_t count) {
     if (count <= kMaxMolecules)
@@ -163,7 +167,7 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
     struct CExpansion {
         std::vector<CSimDiag> diagonals;
         bool aborted = false;
-        bool lowMemory = false;
+        bool outOfRoom = false;
     };
     const std::function<CExpansion(std::size_t, int)> expand = [&](std::size_t k, int worker) {
         CDiagonalExpander& expander = expanders[worker];
@@ -171,8 +175,8 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
         const std::function<bool()> shouldAbort = [&] {
             if (IsCancelled())
                 return true;
-            expansion.lowMemory = m_heldBytes.load() > m_memoryBudget || IsMemoryLow();
-            return expansion.lowMemory;
+            expansion.outOfRoom = OutOfRoom();
+            return expansion.outOfRoom;
         };
         expansion.aborted = !expander.Expand(m_hits[k], shouldAbort, expansion.diagonals);
         return expansion;
@@ -182,8 +186,8 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
                                                                    CExpansion& expansion) {
         ReportProgress("Expanding diagonals (hit %d of %d)", static_cast<int>(k) + 1, total);
         if (expansion.aborted) {
-            if (expansion.lowMemory)
-                StopLowOnMemory();
+            if (expansion.outOfRoom)
+                StopOutOfRoom();
             else
                 m_failure = kCancelled;
             stopped = true;
@@ -198,9 +202,15 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
     return !stopped;
 }
 
-void CSimTool::StopLowOnMemory() {
-    ShowMessage(kLowMemoryMessage);
-    m_failure = kLowMemory;
+bool CSimTool::OutOfRoom() {
+    return m_heldBytes.load() > m_memoryBudget || IsMemoryLow();
+}
+
+void CSimTool::StopOutOfRoom() {
+    // What the search holds only grows, so the budget is still exceeded if it was.
+    const bool overBudget = m_heldBytes.load() > m_memoryBudget;
+    ShowMessage(overBudget ? kTooManyDiagonalsMessage : kLowMemoryMessage);
+    m_failure = overBudget ? kTooManyDiagonals : kLowMemory;
 }
 
 bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
@@ -211,7 +221,9 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
         sequences.push_back(&molecule.Codes());
     const int longest = LongestSequenceLength();
     const int workers = WorkerCount(m_threadCount);
-    std::vector<CJoinedRunCache> joins(workers, CJoinedRunCache(sequences, grid, m_cutoff));
+    std::vector<CJoinedRunCache> joins;
+    for (int worker = 0; worker < workers; ++worker)
+        joins.emplace_back(sequences, grid, m_cutoff);
     using CCandidates = std::vector<CBlockCandidate>;
     const std::function<CCandidates(std::size_t, int)> scan = [&](std::size_t k, int worker) {
         CCandidates candidates;
@@ -225,14 +237,14 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
         ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)",
                        static_cast<int>(k) + 1, total);
         // Made here, in diagonal order, so that identifiers follow the order blocks are made.
-        for (const CBlockCandidate& candidate : candidates) {
-            blocks.push_back(std::make_unique<CSimBlock>());
-            blocks.back()->Init(candidate.molecules, candidate.starts, candidate.width,
-                                candidate.score, 0);
+        for (CBlockCandidate& candidate : candidates) {
             m_heldBytes += BlockBytes(candidate.molecules.size());
+            blocks.push_back(std::make_unique<CSimBlock>());
+            blocks.back()->Init(std::move(candidate.molecules), std::move(candidate.starts),
+                                candidate.width, candidate.score, 0);
         }
-        if (m_heldBytes.load() > m_memoryBudget || IsMemoryLow()) {
-            StopLowOnMemory();
+        if (OutOfRoom()) {
+            StopOutOfRoom();
             stopped = true;
             return false;
         }

@@ -28,9 +28,11 @@ class CSimTool {
     // The masks that relate molecules hold one bit per molecule.
     static constexpr int kMaxMolecules = 64;
     static const char* const kLowMemoryMessage;
-    // How much the diagonals and blocks of one search may hold before it stops as low on memory.
-    // Families with self-similar stretches have exponentially many diagonals; the budget stops
-    // them early instead of when the whole system runs out.
+    static const char* const kTooManyDiagonalsMessage;
+    // How much the diagonals and blocks of one search may hold. Copies of one sequence that
+    // resembles itself at other offsets can sit on either of two diagonals each, so their
+    // maximal diagonals grow exponentially with their number; the budget stops such a search
+    // early with its own message instead of when the whole system runs out.
     static constexpr std::size_t kDefaultMemoryBudget = std::size_t{128} << 20;
 
     // Why a run did not complete.
@@ -40,6 +42,7 @@ class CSimTool {
         kTooManyMolecules,     // more than kMaxMolecules
         kUnencodableSequence,  // a residue outside the matrix alphabet (see FailedMolecule())
         kLowMemory,            // the system ran low on memory during expansion
+        kTooManyDiagonals,     // the diagonals and blocks outgrew the memory budget
         kOutOfMemory,          // an allocation failed
         kCancelled,
     };
@@ -103,8 +106,10 @@ class CSimTool {
     bool ExpandDiagonals(const CHitMasks& masks, bool& cancelled);
     bool ScanDiagonals(const CScoreGrid& grid, bool& cancelled);
     int Fail(Failure failure);
-    // Stops the run as low on memory: shows the message and records the failure.
-    void StopLowOnMemory();
+    // Whether the search holds more than its budget or the system is low on memory.
+    bool OutOfRoom();
+    // Shows the message for the reason OutOfRoom() answered true and records the failure.
+    void StopOutOfRoom();
     int EffectiveMinSequences() const;
 
     std::unique_ptr<CScoreMatrix> m_matrix;

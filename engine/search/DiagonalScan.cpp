@@ -41,24 +41,14 @@ struct CJoinEvent {
     int b;
 };
 
-// The members reachable from `root` through joins to members above the root, or nothing when
-// the root was reached from a lower member or has no join (a lone member makes no block).
-std::uint64_t GroupOf(int root, const std::uint64_t* joins, std::uint64_t& visited) {
-    if ((visited >> root) & 1)
-        return 0;
-    const std::uint64_t above = root + 1 < 64 ? ~std::uint64_t{0} << (root + 1) : 0;
-    std::uint64_t group = std::uint64_t{1} << root;
-    std::uint64_t frontier = group;
-    visited |= group;
-    while (frontier != 0) {
-        const int node = std::countr_zero(frontier);
-        frontier &= frontier - 1;
-        const std::uint64_t next = joins[node] & above & ~visited;
-        visited |= next;
-        group |= next;
-        frontier |= next;
-    }
-    return (group & (group - 1)) != 0 ? group : 0;
+// The group that a sweep from `root` collects: the members reachable from it through joins to
+// members above it. Roots go up from member 0, and a member reached from a lower root collects
+// nothing, so that is the root's connected set when the root is the lowest member of the set,
+// else nothing; a lone member makes no group either.
+std::uint64_t GroupRootedAt(int root, std::uint64_t component) {
+    const bool lowest = std::countr_zero(component) == root;
+    const bool several = (component & (component - 1)) != 0;
+    return lowest && several ? component : 0;
 }
 
 // Whether a and b are connected through joins.
@@ -124,9 +114,9 @@ class CDiagonalScanner {
             }
             if (!GroupsChanged(first, e, joins, component))
                 continue;
-            std::uint64_t visited = 0;
+            UpdateComponents(count, joins, component);
             for (int root = 0; root + 1 < count; ++root) {
-                const std::uint64_t group = GroupOf(root, joins, visited);
+                const std::uint64_t group = GroupRootedAt(root, component[root]);
                 if (group == previous[root])
                     continue;
                 if (previous[root] != 0 && std::popcount(previous[root]) >= minSequences &&
@@ -137,7 +127,6 @@ class CDiagonalScanner {
                     runStart[root] = column;
                 previous[root] = group;
             }
-            UpdateComponents(count, joins, component);
         }
     }
 
@@ -196,6 +185,10 @@ class CDiagonalScanner {
         CBlockCandidate block;
         block.width = endColumn - firstColumn;
         std::vector<int> members;
+        const int size = std::popcount(group);
+        members.reserve(size);
+        block.molecules.reserve(size);
+        block.starts.reserve(size);
         for (std::uint64_t rest = group; rest != 0; rest &= rest - 1) {
             const int t = std::countr_zero(rest);
             members.push_back(t);
@@ -225,13 +218,13 @@ class CDiagonalScanner {
 }  // namespace
 
 const CPairJoin& CJoinedRunCache::Join(int a, int b, int offset) {
-    const std::uint64_t key = (static_cast<std::uint64_t>(a) << 40) |
-                              (static_cast<std::uint64_t>(b) << 34) |
-                              static_cast<std::uint32_t>(offset);
-    auto [entry, added] = m_joins.try_emplace(key);
-    CPairJoin& join = entry->second;
-    if (!added)
-        return join;
+    CPlacements& placements = m_byPair[a * m_sequences.size() + b];
+    for (std::size_t k = 0; k < placements.offsets.size(); ++k) {
+        if (placements.offsets[k] == offset)
+            return *placements.joins[k];
+    }
+    placements.offsets.push_back(offset);
+    CPairJoin& join = *placements.joins.emplace_back(std::make_unique<CPairJoin>());
     // Positions of a whose partner in b exists.
     join.first = std::max(0, -offset);
     const int end = std::max(join.first, std::min(Length(a), Length(b) - offset));

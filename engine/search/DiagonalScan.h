@@ -8,7 +8,7 @@
 // only change where a joined run starts or ends, so only those columns are examined.
 
 #include <cstdint>
-#include <unordered_map>
+#include <memory>
 #include <vector>
 
 #include "SimDiag.h"
@@ -51,7 +51,10 @@ class CJoinedRunCache {
   public:
     CJoinedRunCache(const std::vector<const std::vector<std::uint8_t>*>& sequences,
                     const CScoreGrid& grid, int cutoff)
-        : m_sequences(sequences), m_grid(grid), m_cutoff(cutoff) {}
+        : m_sequences(sequences),
+          m_grid(grid),
+          m_cutoff(cutoff),
+          m_byPair(sequences.size() * sequences.size()) {}
 
     // Molecules a and b with residue p of a facing residue p + offset of b. The reference stays
     // valid as long as the cache.
@@ -63,7 +66,13 @@ class CJoinedRunCache {
     const std::vector<const std::vector<std::uint8_t>*>& m_sequences;
     const CScoreGrid& m_grid;
     int m_cutoff;
-    std::unordered_map<std::uint64_t, CPairJoin> m_joins;
+    // Per molecule pair a * count + b, the placements worked out so far: a pair has a few hit
+    // offsets, so a short list beats hashing.
+    struct CPlacements {
+        std::vector<std::int32_t> offsets;
+        std::vector<std::unique_ptr<CPairJoin>> joins;
+    };
+    std::vector<CPlacements> m_byPair;
 };
 
 // Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the

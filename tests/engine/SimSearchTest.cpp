@@ -265,15 +265,31 @@ TEST(SimTool, LowMemoryDuringExpansionShowsTheMessageOnceAndFails) {
                                        "Unable to proceed with block searching."});
     EXPECT_EQ(search.tool->LastFailure(), CSimTool::kLowMemory);
     EXPECT_TRUE(search.tool->Diagonals().empty());
+}
 
-    // The same when the search's own diagonals and blocks outgrow its budget.
+// A sequence whose two ends match each other (offset 14, and no other offset but 0 reaches the
+// cutoff 40) lets every copy sit on either of two diagonals: the copies at offsets drawn from
+// {0, 14}, or from {-14, 0}, relative to the first
+// are all maximal diagonals, 2^n - 1 of them for n copies. The count is what the search defines,
+// so no expansion can avoid it; the budget below is what stops large families of this kind.
+TEST(SimTool, CopiesOfASelfSimilarSequenceDoubleTheDiagonalsWithEachCopy) {
+    const std::string sequence = "WWWWNIGTPVQGLRWWWW";
+    for (int copies = 2; copies <= 8; ++copies) {
+        CSearch search(std::vector<std::string>(copies, sequence), 40, 2);
+        ASSERT_EQ(search.tool->Run(), 1);
+        EXPECT_EQ(search.tool->Diagonals().size(), (std::size_t{1} << copies) - 1) << copies;
+    }
+}
+
+TEST(SimTool, DiagonalsBeyondTheBudgetStopTheSearchWithTheirOwnMessage) {
     for (int threads : {1, 2}) {
         CSearch overBudget({"WWWK", "KWWW", "KKWWW", "WWWKK"}, 33, 2);
         overBudget.tool->SetThreadCount(threads);
         overBudget.tool->SetMemoryBudget(1);
         EXPECT_EQ(overBudget.tool->Run(), 0);
-        EXPECT_EQ(overBudget.tool->messages.size(), 1u);
-        EXPECT_EQ(overBudget.tool->LastFailure(), CSimTool::kLowMemory);
+        EXPECT_EQ(overBudget.tool->messages,
+                  std::vector<std::string>{CSimTool::kTooManyDiagonalsMessage});
+        EXPECT_EQ(overBudget.tool->LastFailure(), CSimTool::kTooManyDiagonals);
         EXPECT_EQ(overBudget.result.BlockCount(), 0);
     }
 }
