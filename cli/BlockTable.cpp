@@ -1,6 +1,7 @@
 #include "BlockTable.h"
 
-#include <cstdio>
+#include <charconv>
+#include <ostream>
 
 #include "BlockSignificance.h"
 #include "ScoreMatrix.h"
@@ -13,10 +14,18 @@ namespace {
 
 constexpr CSimBlock::Layout kShown = CSimBlock::kCurrent;
 
-std::string Printf(const char* format, double value) {
-    char text[64];
-    std::snprintf(text, sizeof text, format, value);
-    return text;
+// The table goes out whenever this much of it has been formatted.
+constexpr std::size_t kChunkBytes = 64 * 1024;
+
+// Room for any double in fixed notation (up to 309 integer digits) with a small precision.
+constexpr int kNumberChars = 400;
+
+template <typename Number, typename... Format>
+void AppendNumber(std::string& text, Number value, Format... format) {
+    char digits[kNumberChars];
+    const std::to_chars_result result =
+        std::to_chars(digits, digits + sizeof digits, value, format...);
+    text.append(digits, result.ptr);
 }
 
 const char* SignificanceWord(int state) {
@@ -30,37 +39,85 @@ const char* SignificanceWord(int state) {
     }
 }
 
-// The included members in member order: entry name and 1-based current start.
-std::vector<std::pair<std::string, int>> ShownMembers(const CSimBlockSet& set,
-                                                      const CSimBlock& block) {
-    std::vector<std::pair<std::string, int>> members;
+// Calls `visit(name, start)` for the included members in member order, with the entry name and
+// the 1-based current start.
+template <typename Visit>
+void ForEachShownMember(const CSimBlockSet& set, const CSimBlock& block, Visit visit) {
+    static const std::string kUnknownName = "?";
     for (int i = 0; i < block.MemberCount(); ++i) {
         if (!block.IsIncluded(i))
             continue;
         const CSxMolEntry* entry = set.MoleculeAt(block.Member(i));
-        members.emplace_back(entry ? entry->Name() : "?", block.Start(kShown, i) + 1);
+        visit(entry ? entry->Name() : kUnknownName, block.Start(kShown, i) + 1);
     }
-    return members;
 }
 
 }  // namespace
 
-std::string BlockTableRow(const CSimBlockSet& set, int index, const CScoreMatrix& matrix,
-                          double expectationLimit) {
+void AppendFixed(std::string& text, double value, int precision) {
+    AppendNumber(text, value, std::chars_format::fixed, precision);
+}
+
+void AppendScientific(std::string& text, double value, int precision) {
+    AppendNumber(text, value, std::chars_format::scientific, precision);
+}
+
+void AppendBlockTableRow(std::string& text, const CSimBlockSet& set, int index,
+                         const CScoreMatrix& matrix, double expectationLimit) {
     const CSimBlock& block = *set.BlockAt(index);
     const CBlockSignificance significance =
         EvaluateBlockSignificance(block, &set, matrix, expectationLimit, kShown);
-    std::string members;
-    for (const auto& [name, start] : ShownMembers(set, block)) {
-        members += (members.empty() ? "" : ",") + name + ":" + std::to_string(start);
+    AppendNumber(text, index + 1);
+    text += '\t';
+    text += block.Name();
+    text += '\t';
+    AppendNumber(text, block.SequenceCount(kShown));
+    text += '\t';
+    AppendNumber(text, block.Width(kShown));
+    text += '\t';
+    AppendFixed(text, block.MeanPairScore(kShown), 1);
+    text += '\t';
+    AppendNumber(text, block.Score(kShown));
+    text += '\t';
+    text += SignificanceWord(significance.state);
+    text += '\t';
+    AppendScientific(text, significance.p, 3);
+    text += '\t';
+    AppendNumber(text, block.LowestStart(kShown) + 1);
+    text += '\t';
+    bool first = true;
+    ForEachShownMember(set, block, [&](const std::string& name, int start) {
+        if (!first)
+            text += ',';
+        first = false;
+        text += name;
+        text += ':';
+        AppendNumber(text, start);
+    });
+}
+
+std::string BlockTableRow(const CSimBlockSet& set, int index, const CScoreMatrix& matrix,
+                          double expectationLimit) {
+    std::string row;
+    AppendBlockTableRow(row, set, index, matrix, expectationLimit);
+    return row;
+}
+
+void WriteBlockTable(std::ostream& out, const CSimBlockSet& set, const CScoreMatrix& matrix,
+                     double expectationLimit) {
+    std::string chunk;
+    chunk.reserve(2 * kChunkBytes);
+    chunk += kBlockTableHeader;
+    chunk += '\n';
+    for (int b = 0; b < set.BlockCount(); ++b) {
+        AppendBlockTableRow(chunk, set, b, matrix, expectationLimit);
+        chunk += '\n';
+        if (chunk.size() >= kChunkBytes) {
+            out.write(chunk.data(), static_cast<std::streamsize>(chunk.size()));
+            chunk.clear();
+        }
     }
-    return std::to_string(index + 1) + "\t" + block.Name() + "\t" +
-           std::to_string(block.SequenceCount(kShown)) + "\t" +
-           std::to_string(block.Width(kShown)) + "\t" +
-           Printf("%.1f", block.MeanPairScore(kShown)) + "\t" +
-           std::to_string(block.Score(kShown)) + "\t" + SignificanceWord(significance.state) +
-           "\t" + Printf("%.3e", significance.p) + "\t" +
-           std::to_string(block.LowestStart(kShown) + 1) + "\t" + members;
+    out.write(chunk.data(), static_cast<std::streamsize>(chunk.size()));
 }
 
 nlohmann::json BlockJson(const CSimBlockSet& set, int index, const CScoreMatrix& matrix,
@@ -69,9 +126,9 @@ nlohmann::json BlockJson(const CSimBlockSet& set, int index, const CScoreMatrix&
     const CBlockSignificance significance =
         EvaluateBlockSignificance(block, &set, matrix, expectationLimit, kShown);
     nlohmann::json members = nlohmann::json::array();
-    for (const auto& [name, start] : ShownMembers(set, block)) {
+    ForEachShownMember(set, block, [&](const std::string& name, int start) {
         members.push_back({{"name", name}, {"start", start}});
-    }
+    });
     return {{"block", index + 1},
             {"name", block.Name()},
             {"m", block.SequenceCount(kShown)},

@@ -2,12 +2,12 @@
 
 #include <ostream>
 
-int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream& err,
-           bool errIsTerminal) {
+int RunCli(const std::vector<std::string>& args, CCliContext& context) {
+    std::ostream& out = context.out;
+    std::ostream& err = context.err;
     CLI::App app("Finds conserved ungapped blocks in sets of protein sequences.",
                  "tiler-blocks-cli");
     app.require_subcommand(1);
-    CCliContext context{out, err, errIsTerminal};
     AddMatrixCommands(app, context);
     AddMoleculeCommands(app, context);
     AddProjectCommands(app, context);
@@ -36,4 +36,10 @@ int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream
         return e.Status();
     }
     return context.status;
+}
+
+int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream& err,
+           bool errIsTerminal) {
+    CCliContext context{out, err, errIsTerminal};
+    return RunCli(args, context);
 }

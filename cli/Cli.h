@@ -4,6 +4,7 @@
 #include <CLI/CLI.hpp>
 
 #include <iosfwd>
+#include <memory>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -24,10 +25,15 @@ class CCliError : public std::runtime_error {
 
 // What a command writes to and reports back.
 struct CCliContext {
+    CCliContext(std::ostream& out, std::ostream& err, bool errIsTerminal = false)
+        : out(out), err(err), errIsTerminal(errIsTerminal) {}
+
     std::ostream& out;
     std::ostream& err;
     bool errIsTerminal = false;  // progress is shown on stderr only on a terminal
     int status = kCliDone;
+    // Objects a command hands back to main, which may end the process without destroying them.
+    std::vector<std::shared_ptr<void>> keepAlive;
 };
 
 // Each command group adds its subcommands to the application; their callbacks write through
@@ -38,5 +44,9 @@ void AddProjectCommands(CLI::App& app, CCliContext& context);
 void AddSearchCommand(CLI::App& app, CCliContext& context);
 
 // Parses `args` (without the program name) and runs the command; returns the exit status.
+// What the command leaves in `context.keepAlive` lives as long as the context.
+int RunCli(const std::vector<std::string>& args, CCliContext& context);
+
+// The same with a context of its own, destroyed before returning.
 int RunCli(const std::vector<std::string>& args, std::ostream& out, std::ostream& err,
            bool errIsTerminal = false);

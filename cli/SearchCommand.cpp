@@ -212,10 +212,7 @@ void PrintResult(const CBlockProject& project, const CSearchOutcome& outcome,
         out << result.dump(2) << "\n";
         return;
     }
-    out << kBlockTableHeader << "\n";
-    for (int b = 0; b < set.BlockCount(); ++b) {
-        out << BlockTableRow(set, b, params.Matrix(), params.ExpectationLimit()) << "\n";
-    }
+    WriteBlockTable(out, set, params.Matrix(), params.ExpectationLimit());
 }
 
 void WriteOutputs(const CBlockProject& project, const CSearchOptions& options) {
@@ -236,7 +233,9 @@ void WriteOutputs(const CBlockProject& project, const CSearchOptions& options) {
 }
 
 void RunSearch(const CSearchOptions& options, CCliContext& context) {
-    CBlockProject project;  // the defaults: the user's own template is read only when named
+    // The defaults: the user's own template is read only when named.
+    const auto owner = std::make_shared<CBlockProject>();
+    CBlockProject& project = *owner;
     ApplyParameters(options, project.Params(), context);
     AddFiles(options, project, context);
     const CSearchOutcome outcome = SearchAll(project, options, context);
@@ -252,6 +251,8 @@ void RunSearch(const CSearchOptions& options, CCliContext& context) {
         context.err << "hits: " << outcome.hits << "  diagonals: " << outcome.diagonals
                     << "  blocks: " << project.BlockSet().BlockCount() << "\n";
     }
+    // Main may end the process without taking the many blocks apart one by one.
+    context.keepAlive.push_back(owner);
 }
 
 }  // namespace
