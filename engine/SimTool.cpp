@@ -221,13 +221,11 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
         sequences.push_back(&molecule.Codes());
     const int longest = LongestSequenceLength();
     const int workers = WorkerCount(m_threadCount);
-    std::vector<CJoinedRunCache> joins;
-    for (int worker = 0; worker < workers; ++worker)
-        joins.emplace_back(sequences, grid, m_cutoff);
+    const CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets, m_diagonals);
     using CCandidates = std::vector<CBlockCandidate>;
-    const std::function<CCandidates(std::size_t, int)> scan = [&](std::size_t k, int worker) {
+    const std::function<CCandidates(std::size_t, int)> scan = [&](std::size_t k, int) {
         CCandidates candidates;
-        ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins[worker], candidates);
+        ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins, candidates);
         return candidates;
     };
     std::vector<std::unique_ptr<CSimBlock>> blocks;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <bit>
+#include <stdexcept>
 
 void FindJoinedRuns(const std::uint8_t* a, const std::uint8_t* b, int length,
                     const CScoreGrid& grid, int cutoff, std::vector<CJoinedRun>& runs) {
@@ -69,7 +70,7 @@ bool Connected(int a, int b, const std::uint64_t* joins) {
 
 class CDiagonalScanner {
   public:
-    CDiagonalScanner(const CSimDiag& diagonal, int longest, CJoinedRunCache& joins)
+    CDiagonalScanner(const CSimDiag& diagonal, int longest, const CPlacementJoins& joins)
         : m_diagonal(diagonal), m_joins(joins) {
         for (int t = 0; t < diagonal.MemberCount(); ++t) {
             m_firstColumn.push_back(longest - diagonal.offsets[t]);
@@ -209,7 +210,7 @@ class CDiagonalScanner {
     }
 
     const CSimDiag& m_diagonal;
-    CJoinedRunCache& m_joins;
+    const CPlacementJoins& m_joins;
     std::vector<const CPairJoin*> m_pairJoins;  // per member pair a < b: index a * count + b
     std::vector<int> m_firstColumn;
     std::vector<CJoinEvent> m_events;
@@ -217,25 +218,22 @@ class CDiagonalScanner {
 
 }  // namespace
 
-const CPairJoin& CJoinedRunCache::Join(int a, int b, int offset) {
-    CPlacements& placements = m_byPair[a * m_sequences.size() + b];
-    for (std::size_t k = 0; k < placements.offsets.size(); ++k) {
-        if (placements.offsets[k] == offset)
-            return *placements.joins[k];
-    }
-    placements.offsets.push_back(offset);
-    CPairJoin& join = *placements.joins.emplace_back(std::make_unique<CPairJoin>());
-    // Positions of a whose partner in b exists.
+namespace {
+
+// Residue p of `a` facing residue p + offset of `b`, over the positions of a whose partner exists.
+CPairJoin JoinOf(const std::vector<std::uint8_t>& a, const std::vector<std::uint8_t>& b, int offset,
+                 const CScoreGrid& grid, int cutoff) {
+    CPairJoin join;
     join.first = std::max(0, -offset);
-    const int end = std::max(join.first, std::min(Length(a), Length(b) - offset));
-    const std::uint8_t* residuesA = Residues(a) + join.first;
-    const std::uint8_t* residuesB = Residues(b) + join.first + offset;
+    const int length = static_cast<int>(a.size());
+    const int end = std::max(join.first, std::min(length, static_cast<int>(b.size()) - offset));
+    const std::uint8_t* residuesA = a.data() + join.first;
+    const std::uint8_t* residuesB = b.data() + join.first + offset;
     join.prefix.assign(end - join.first + 1, 0);
-    for (int k = 0; k < end - join.first; ++k) {
-        join.prefix[k + 1] = join.prefix[k] + m_grid(residuesA[k], residuesB[k]);
-    }
+    for (int k = 0; k < end - join.first; ++k)
+        join.prefix[k + 1] = join.prefix[k] + grid(residuesA[k], residuesB[k]);
     if (end > join.first) {
-        FindJoinedRuns(residuesA, residuesB, end - join.first, m_grid, m_cutoff, join.runs);
+        FindJoinedRuns(residuesA, residuesB, end - join.first, grid, cutoff, join.runs);
         for (CJoinedRun& run : join.runs) {
             run.begin += join.first;
             run.end += join.first;
@@ -244,8 +242,53 @@ const CPairJoin& CJoinedRunCache::Join(int a, int b, int offset) {
     return join;
 }
 
-void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CJoinedRunCache& joins,
-                  std::vector<CBlockCandidate>& blocks) {
+}  // namespace
+
+CPlacementJoins::CPlacementJoins(
+    const std::vector<const std::vector<std::uint8_t>*>& sequences, const CScoreGrid& grid,
+    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
+    const std::vector<CSimDiag>& diagonals)
+    : m_pairOffsets(pairOffsets), m_firstOfPair(pairOffsets.size() * pairOffsets.size(), 0) {
+    const std::size_t count = pairOffsets.size();
+    std::size_t placements = 0;
+    for (std::size_t a = 0; a < count; ++a) {
+        for (std::size_t b = a + 1; b < count; ++b) {
+            m_firstOfPair[a * count + b] = placements;
+            placements += pairOffsets[a][b].size();
+        }
+    }
+    m_joins.resize(placements);
+    std::vector<bool> done(placements, false);
+    for (const CSimDiag& diagonal : diagonals) {
+        for (int u = 0; u < diagonal.MemberCount(); ++u) {
+            for (int v = u + 1; v < diagonal.MemberCount(); ++v) {
+                const int a = diagonal.members[u];
+                const int b = diagonal.members[v];
+                const int offset = diagonal.offsets[v] - diagonal.offsets[u];
+                const std::size_t index = IndexOf(a, b, offset);
+                if (done[index])
+                    continue;
+                done[index] = true;
+                m_joins[index] = JoinOf(*sequences[a], *sequences[b], offset, grid, cutoff);
+            }
+        }
+    }
+}
+
+std::size_t CPlacementJoins::IndexOf(int a, int b, int offset) const {
+    const std::vector<std::int32_t>& offsets = m_pairOffsets[a][b];
+    const auto found = std::lower_bound(offsets.begin(), offsets.end(), offset);
+    if (found == offsets.end() || *found != offset)
+        throw std::logic_error("two members of a diagonal without a hit at their offset");
+    return m_firstOfPair[a * m_pairOffsets.size() + b] + (found - offsets.begin());
+}
+
+const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) const {
+    return m_joins[IndexOf(a, b, offset)];
+}
+
+void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences,
+                  const CPlacementJoins& joins, std::vector<CBlockCandidate>& blocks) {
     CDiagonalScanner scanner(diagonal, longest, joins);
     scanner.CollectJoins();
     scanner.Sweep(minSequences, blocks);

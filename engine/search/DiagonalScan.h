@@ -8,7 +8,6 @@
 // only change where a joined run starts or ends, so only those columns are examined.
 
 #include <cstdint>
-#include <memory>
 #include <vector>
 
 #include "SimDiag.h"
@@ -46,36 +45,31 @@ struct CPairJoin {
 };
 
 // What two molecules in one relative placement give depends on nothing else, and the diagonals
-// of a search share most of their placements: each is worked out once per search.
-class CJoinedRunCache {
+// of a search share most of their placements. Every two members of a diagonal sit at the offset
+// of one of their hits, so the joins of the hit placements that the diagonals use are worked
+// out once, before the scan, and the workers share them.
+class CPlacementJoins {
   public:
-    CJoinedRunCache(const std::vector<const std::vector<std::uint8_t>*>& sequences,
-                    const CScoreGrid& grid, int cutoff)
-        : m_sequences(sequences),
-          m_grid(grid),
-          m_cutoff(cutoff),
-          m_byPair(sequences.size() * sequences.size()) {}
+    // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order.
+    CPlacementJoins(const std::vector<const std::vector<std::uint8_t>*>& sequences,
+                    const CScoreGrid& grid, int cutoff,
+                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
+                    const std::vector<CSimDiag>& diagonals);
 
-    // Molecules a and b with residue p of a facing residue p + offset of b. The reference stays
-    // valid as long as the cache.
-    const CPairJoin& Join(int a, int b, int offset);
-    int Length(int molecule) const { return static_cast<int>(m_sequences[molecule]->size()); }
-    const std::uint8_t* Residues(int molecule) const { return m_sequences[molecule]->data(); }
+    // Molecules a < b with residue p of a facing residue p + offset of b, where offset is one of
+    // their hit offsets (std::logic_error otherwise).
+    const CPairJoin& Join(int a, int b, int offset) const;
 
   private:
-    const std::vector<const std::vector<std::uint8_t>*>& m_sequences;
-    const CScoreGrid& m_grid;
-    int m_cutoff;
-    // Per molecule pair a * count + b, the placements worked out so far: a pair has a few hit
-    // offsets, so a short list beats hashing.
-    struct CPlacements {
-        std::vector<std::int32_t> offsets;
-        std::vector<std::unique_ptr<CPairJoin>> joins;
-    };
-    std::vector<CPlacements> m_byPair;
+    std::size_t IndexOf(int a, int b, int offset) const;
+
+    const std::vector<std::vector<std::vector<std::int32_t>>>& m_pairOffsets;
+    std::vector<std::size_t> m_firstOfPair;  // per pair a * count + b: its first join
+    std::vector<CPairJoin> m_joins;          // pair by pair, each in offset order; only those of
+                                             // the diagonals are worked out
 };
 
 // Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the
 // longest molecule of the search; `minSequences` is at least 2.
-void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CJoinedRunCache& joins,
-                  std::vector<CBlockCandidate>& blocks);
+void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences,
+                  const CPlacementJoins& joins, std::vector<CBlockCandidate>& blocks);

@@ -28,17 +28,19 @@ bool IsLowOnMemory(const CMemoryFigures& figures) {
 }
 
 bool CMemoryWatch::IsLow() {
-    const std::lock_guard<std::mutex> lock(m_mutex);
-    const auto now = std::chrono::steady_clock::now();
-    if (m_read && now - m_lastRead < m_interval)
-        return m_low;
-    m_read = true;
-    m_lastRead = now;
+    using std::chrono::nanoseconds;
+    const std::int64_t now =
+        nanoseconds(std::chrono::steady_clock::now().time_since_epoch()).count();
+    std::int64_t due = m_nextRead.load(std::memory_order_relaxed);
+    if (now < due ||
+        !m_nextRead.compare_exchange_strong(due, now + nanoseconds(m_interval).count()))
+        return m_low.load(std::memory_order_relaxed);
     std::ifstream file("/proc/meminfo");
     std::stringstream text;
     text << file.rdbuf();
     const auto figures = ParseMemInfo(text.str());
     // Without the figures the search goes on: it cannot tell, and must not refuse to run.
-    m_low = figures && IsLowOnMemory(*figures);
-    return m_low;
+    const bool low = figures && IsLowOnMemory(*figures);
+    m_low.store(low, std::memory_order_relaxed);
+    return low;
 }

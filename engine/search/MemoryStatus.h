@@ -2,9 +2,10 @@
 // How much memory the system can still give: the figures of /proc/meminfo, read at most a few
 // times a second during a search.
 
+#include <atomic>
 #include <chrono>
 #include <cstdint>
-#include <mutex>
+#include <limits>
 #include <optional>
 #include <string>
 
@@ -18,7 +19,9 @@ std::optional<CMemoryFigures> ParseMemInfo(const std::string& text);
 // Less than a twentieth of all memory is still available.
 bool IsLowOnMemory(const CMemoryFigures& figures);
 
-// The low-memory state, refreshed from the system at most every `interval`. Thread-safe.
+// The low-memory state, refreshed from the system at most every `interval`. Thread-safe without
+// a lock: the search asks at every step of every worker, and one caller at a time refreshes
+// while the others take the state last read.
 class CMemoryWatch {
   public:
     explicit CMemoryWatch(std::chrono::milliseconds interval = std::chrono::milliseconds(100))
@@ -26,9 +29,8 @@ class CMemoryWatch {
     bool IsLow();
 
   private:
-    std::mutex m_mutex;
     std::chrono::milliseconds m_interval;
-    std::chrono::steady_clock::time_point m_lastRead{};
-    bool m_read = false;
-    bool m_low = false;
+    // When the next refresh is due, in steady-clock nanoseconds.
+    std::atomic<std::int64_t> m_nextRead{std::numeric_limits<std::int64_t>::min()};
+    std::atomic<bool> m_low{false};
 };
