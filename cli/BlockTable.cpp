@@ -52,6 +52,14 @@ void ForEachShownMember(const CSimBlockSet& set, const CSimBlock& block, Visit v
     }
 }
 
+// Writes `chunk` out once it has grown large enough (or always, at the end).
+void FlushChunk(std::ostream& out, std::string& chunk, bool last = false) {
+    if (!last && chunk.size() < kChunkBytes)
+        return;
+    out.write(chunk.data(), static_cast<std::streamsize>(chunk.size()));
+    chunk.clear();
+}
+
 }  // namespace
 
 void AppendFixed(std::string& text, double value, int precision) {
@@ -112,12 +120,9 @@ void WriteBlockTable(std::ostream& out, const CSimBlockSet& set, const CScoreMat
     for (int b = 0; b < set.BlockCount(); ++b) {
         AppendBlockTableRow(chunk, set, b, matrix, expectationLimit);
         chunk += '\n';
-        if (chunk.size() >= kChunkBytes) {
-            out.write(chunk.data(), static_cast<std::streamsize>(chunk.size()));
-            chunk.clear();
-        }
+        FlushChunk(out, chunk);
     }
-    out.write(chunk.data(), static_cast<std::streamsize>(chunk.size()));
+    FlushChunk(out, chunk, true);
 }
 
 nlohmann::json BlockJson(const CSimBlockSet& set, int index, const CScoreMatrix& matrix,
@@ -139,4 +144,37 @@ nlohmann::json BlockJson(const CSimBlockSet& set, int index, const CScoreMatrix&
             {"p", significance.p},
             {"offset", block.LowestStart(kShown) + 1},
             {"members", members}};
+}
+
+void WriteBlocksJson(std::ostream& out, const CSimBlockSet& set, const CScoreMatrix& matrix,
+                     double expectationLimit, int depth) {
+    constexpr int kIndent = 2;
+    if (set.BlockCount() == 0) {
+        out << "[]";
+        return;
+    }
+    // Each block is built and dumped on its own (the whole document of a large search would take
+    // far more memory than its text), then indented to its depth.
+    const std::string outer(static_cast<std::size_t>(depth * kIndent), ' ');
+    const std::string inner(outer.size() + kIndent, ' ');
+    std::string chunk;
+    chunk.reserve(2 * kChunkBytes);
+    chunk += "[\n";
+    for (int b = 0; b < set.BlockCount(); ++b) {
+        if (b > 0)
+            chunk += ",\n";
+        chunk += inner;
+        const std::string text = BlockJson(set, b, matrix, expectationLimit).dump(kIndent);
+        std::size_t from = 0;
+        for (std::size_t end; (end = text.find('\n', from)) != std::string::npos; from = end + 1) {
+            chunk.append(text, from, end + 1 - from);
+            chunk += inner;
+        }
+        chunk.append(text, from);
+        FlushChunk(out, chunk);
+    }
+    chunk += '\n';
+    chunk += outer;
+    chunk += ']';
+    FlushChunk(out, chunk, true);
 }

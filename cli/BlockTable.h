@@ -34,3 +34,8 @@ void AppendScientific(std::string& text, double value, int precision);
 // The same values as a JSON object (members as a list of {"name", "start"}).
 nlohmann::json BlockJson(const CSimBlockSet& set, int index, const CScoreMatrix& matrix,
                          double expectationLimit);
+
+// Every block's JSON object as an array, written in large chunks with the same text that
+// nlohmann::json::dump(2) gives for the array nested `depth` levels deep in a document.
+void WriteBlocksJson(std::ostream& out, const CSimBlockSet& set, const CScoreMatrix& matrix,
+                     double expectationLimit, int depth);

@@ -192,24 +192,22 @@ void PrintResult(const CBlockProject& project, const CSearchOutcome& outcome,
     const CSimBlockSet& set = project.BlockSet();
     const CQuilterParams& params = project.Params();
     if (options.format == "json") {
-        nlohmann::json blocks = nlohmann::json::array();
-        for (int b = 0; b < set.BlockCount(); ++b) {
-            blocks.push_back(BlockJson(set, b, params.Matrix(), params.ExpectationLimit()));
-        }
         nlohmann::json molecules = nlohmann::json::array();
         for (const auto& entry : set.Molecules().items) {
             molecules.push_back({{"name", entry->Name()}, {"length", entry->Sequence().size()}});
         }
-        const nlohmann::json result = {{"parameters",
-                                        {{"matrix", params.Matrix().Name()},
-                                         {"cutoff", params.Cutoff()},
-                                         {"min_seqs", params.MinSequences()},
-                                         {"evalue", params.ExpectationLimit()}}},
-                                       {"molecules", molecules},
-                                       {"hits", outcome.hits},
-                                       {"diagonals", outcome.diagonals},
-                                       {"blocks", blocks}};
-        out << result.dump(2) << "\n";
+        const nlohmann::json rest = {{"parameters",
+                                      {{"matrix", params.Matrix().Name()},
+                                       {"cutoff", params.Cutoff()},
+                                       {"min_seqs", params.MinSequences()},
+                                       {"evalue", params.ExpectationLimit()}}},
+                                     {"molecules", molecules},
+                                     {"hits", outcome.hits},
+                                     {"diagonals", outcome.diagonals}};
+        // Keys are written in sorted order, "blocks" first; the blocks are streamed.
+        out << "{\n  \"blocks\": ";
+        WriteBlocksJson(out, set, params.Matrix(), params.ExpectationLimit(), 1);
+        out << "," << rest.dump(2).substr(1) << "\n";
         return;
     }
     WriteBlockTable(out, set, params.Matrix(), params.ExpectationLimit());

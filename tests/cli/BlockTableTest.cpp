@@ -241,6 +241,28 @@ TEST_F(BlockTableOfSearch, EditedLayoutsNamesAndMissingEntriesFormatLikeTheRefer
     }
 }
 
+// The streamed array against the whole document built and dumped at once, at the top level,
+// nested, and with no blocks at all.
+TEST_F(BlockTableOfSearch, StreamedJsonIsTheDumpOfTheWholeDocument) {
+    nlohmann::json blocks = nlohmann::json::array();
+    for (int b = 0; b < Set().BlockCount(); ++b)
+        blocks.push_back(BlockJson(Set(), b, Matrix(), Limit()));
+    auto streamed = [&](int depth) {
+        std::ostringstream out;
+        WriteBlocksJson(out, Set(), Matrix(), Limit(), depth);
+        return out.str();
+    };
+    EXPECT_TRUE(SameText(streamed(0), blocks.dump(2)));
+    const nlohmann::json nested = {{"result", {{"blocks", blocks}}}};
+    EXPECT_TRUE(SameText("{\n  \"result\": {\n    \"blocks\": " + streamed(2) + "\n  }\n}",
+                         nested.dump(2)));
+    EXPECT_EQ(nlohmann::json::parse(streamed(3)), blocks);
+
+    Set().ClearBlocks();
+    EXPECT_EQ(streamed(0), nlohmann::json::array().dump(2));
+    EXPECT_EQ(streamed(1), nlohmann::json::array().dump(2));
+}
+
 // With a matrix that has statistics, P values vary over many magnitudes and blocks are judged
 // significant or not.
 TEST_F(BlockTableOfSearch, SignificanceAndSmallPValuesFormatLikeTheReference) {
