@@ -68,10 +68,10 @@ bool CSimBlock::InLayout(Layout layout, int index) const {
 }
 
 int CSimBlock::SequenceCount(Layout layout) const {
-    int count = 0;
-    for (int i = 0; i < MemberCount(); ++i)
-        count += InLayout(layout, i) ? 1 : 0;
-    return count;
+    if (layout == kOriginal)
+        return MemberCount();
+    return static_cast<int>(
+        std::count_if(m_included.begin(), m_included.end(), [](auto flag) { return flag != 0; }));
 }
 
 int CSimBlock::HighestStart(Layout layout) const {

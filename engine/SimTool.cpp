@@ -221,7 +221,7 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
         sequences.push_back(&molecule.Codes());
     const int longest = LongestSequenceLength();
     const int workers = WorkerCount(m_threadCount);
-    const CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets, m_diagonals);
+    CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets);
     using CCandidates = std::vector<CBlockCandidate>;
     const std::function<CCandidates(std::size_t, int)> scan = [&](std::size_t k, int) {
         CCandidates candidates;

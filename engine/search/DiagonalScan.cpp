@@ -70,12 +70,12 @@ bool Connected(int a, int b, const std::uint64_t* joins) {
 
 class CDiagonalScanner {
   public:
-    CDiagonalScanner(const CSimDiag& diagonal, int longest, const CPlacementJoins& joins)
+    CDiagonalScanner(const CSimDiag& diagonal, int longest, CPlacementJoins& joins)
         : m_diagonal(diagonal), m_joins(joins) {
         for (int t = 0; t < diagonal.MemberCount(); ++t) {
             m_firstColumn.push_back(longest - diagonal.offsets[t]);
         }
-        m_pairJoins.resize(diagonal.MemberCount() * diagonal.MemberCount());
+        m_pairScores.resize(diagonal.MemberCount() * diagonal.MemberCount());
     }
 
     void CollectJoins() {
@@ -85,7 +85,7 @@ class CDiagonalScanner {
                 const int offset = m_diagonal.offsets[b] - m_diagonal.offsets[a];
                 const CPairJoin& join =
                     m_joins.Join(m_diagonal.members[a], m_diagonal.members[b], offset);
-                m_pairJoins[a * count + b] = &join;
+                m_pairScores[a * count + b] = {join.prefix.data(), m_firstColumn[a] + join.first};
                 for (const CJoinedRun& run : join.runs) {
                     m_events.push_back({m_firstColumn[a] + run.begin, true, a, b});
                     m_events.push_back({m_firstColumn[a] + run.end, false, a, b});
@@ -199,10 +199,10 @@ class CDiagonalScanner {
         const int count = m_diagonal.MemberCount();
         std::int64_t score = 0;
         for (std::size_t u = 0; u < members.size(); ++u) {
-            const int start = block.starts[u];
             for (std::size_t v = u + 1; v < members.size(); ++v) {
-                score +=
-                    m_pairJoins[members[u] * count + members[v]]->Sum(start, start + block.width);
+                const CPairScores& pair = m_pairScores[members[u] * count + members[v]];
+                score += pair.prefix[endColumn - pair.firstColumn] -
+                         pair.prefix[firstColumn - pair.firstColumn];
             }
         }
         block.score = static_cast<int>(score);
@@ -210,8 +210,14 @@ class CDiagonalScanner {
     }
 
     const CSimDiag& m_diagonal;
-    const CPlacementJoins& m_joins;
-    std::vector<const CPairJoin*> m_pairJoins;  // per member pair a < b: index a * count + b
+    CPlacementJoins& m_joins;
+    // The running scores of a member pair a < b (index a * count + b) by column: prefix[k] sums
+    // the columns firstColumn .. firstColumn + k - 1.
+    struct CPairScores {
+        const std::int64_t* prefix = nullptr;
+        int firstColumn = 0;
+    };
+    std::vector<CPairScores> m_pairScores;
     std::vector<int> m_firstColumn;
     std::vector<CJoinEvent> m_events;
 };
@@ -246,49 +252,49 @@ CPairJoin JoinOf(const std::vector<std::uint8_t>& a, const std::vector<std::uint
 
 CPlacementJoins::CPlacementJoins(
     const std::vector<const std::vector<std::uint8_t>*>& sequences, const CScoreGrid& grid,
-    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-    const std::vector<CSimDiag>& diagonals)
-    : m_pairOffsets(pairOffsets), m_firstOfPair(pairOffsets.size() * pairOffsets.size(), 0) {
-    const std::size_t count = pairOffsets.size();
-    std::size_t placements = 0;
-    for (std::size_t a = 0; a < count; ++a) {
-        for (std::size_t b = a + 1; b < count; ++b) {
-            m_firstOfPair[a * count + b] = placements;
-            placements += pairOffsets[a][b].size();
+    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets)
+    : m_sequences(sequences), m_grid(grid), m_cutoff(cutoff), m_count(pairOffsets.size()) {
+    for (std::size_t a = 0; a < m_count; ++a) {
+        for (std::size_t b = 0; b < m_count; ++b) {
+            m_firstOfPair.push_back(m_offsets.size());
+            if (a < b)
+                m_offsets.insert(m_offsets.end(), pairOffsets[a][b].begin(),
+                                 pairOffsets[a][b].end());
         }
     }
-    m_joins.resize(placements);
-    std::vector<bool> done(placements, false);
-    for (const CSimDiag& diagonal : diagonals) {
-        for (int u = 0; u < diagonal.MemberCount(); ++u) {
-            for (int v = u + 1; v < diagonal.MemberCount(); ++v) {
-                const int a = diagonal.members[u];
-                const int b = diagonal.members[v];
-                const int offset = diagonal.offsets[v] - diagonal.offsets[u];
-                const std::size_t index = IndexOf(a, b, offset);
-                if (done[index])
-                    continue;
-                done[index] = true;
-                m_joins[index] = JoinOf(*sequences[a], *sequences[b], offset, grid, cutoff);
-            }
-        }
-    }
+    m_firstOfPair.push_back(m_offsets.size());
+    m_joins.resize(m_offsets.size());
+    m_states = std::make_unique<std::atomic<std::uint8_t>[]>(m_offsets.size());
 }
 
 std::size_t CPlacementJoins::IndexOf(int a, int b, int offset) const {
-    const std::vector<std::int32_t>& offsets = m_pairOffsets[a][b];
-    const auto found = std::lower_bound(offsets.begin(), offsets.end(), offset);
-    if (found == offsets.end() || *found != offset)
+    const std::size_t pair = a * m_count + b;
+    const auto first = m_offsets.begin() + m_firstOfPair[pair];
+    const auto end = m_offsets.begin() + m_firstOfPair[pair + 1];
+    const auto found = std::lower_bound(first, end, offset);
+    if (found == end || *found != offset)
         throw std::logic_error("two members of a diagonal without a hit at their offset");
-    return m_firstOfPair[a * m_pairOffsets.size() + b] + (found - offsets.begin());
+    return found - m_offsets.begin();
 }
 
-const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) const {
-    return m_joins[IndexOf(a, b, offset)];
+const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) {
+    const std::size_t index = IndexOf(a, b, offset);
+    std::atomic<std::uint8_t>& state = m_states[index];
+    std::uint8_t seen = state.load(std::memory_order_acquire);
+    if (seen == kMissing && state.compare_exchange_strong(seen, kWorking)) {
+        m_joins[index] = JoinOf(*m_sequences[a], *m_sequences[b], offset, m_grid, m_cutoff);
+        state.store(kReady, std::memory_order_release);
+        state.notify_all();
+        return m_joins[index];
+    }
+    // Another worker is working it out (rarely: each takes a few microseconds).
+    while ((seen = state.load(std::memory_order_acquire)) != kReady)
+        state.wait(seen, std::memory_order_acquire);
+    return m_joins[index];
 }
 
-void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences,
-                  const CPlacementJoins& joins, std::vector<CBlockCandidate>& blocks) {
+void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,
+                  std::vector<CBlockCandidate>& blocks) {
     CDiagonalScanner scanner(diagonal, longest, joins);
     scanner.CollectJoins();
     scanner.Sweep(minSequences, blocks);

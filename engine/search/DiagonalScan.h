@@ -7,7 +7,9 @@
 // over at least two columns and has at least the minimum number of members is a block. Groups
 // only change where a joined run starts or ends, so only those columns are examined.
 
+#include <atomic>
 #include <cstdint>
+#include <memory>
 #include <vector>
 
 #include "SimDiag.h"
@@ -38,38 +40,41 @@ struct CPairJoin {
     int first = 0;
     std::vector<CJoinedRun> runs;      // in positions of the first molecule
     std::vector<std::int64_t> prefix;  // prefix[k]: the scores of positions first..first+k-1
-    // The summed scores of positions [begin, end) of the first molecule.
-    std::int64_t Sum(int begin, int end) const {
-        return prefix[end - first] - prefix[begin - first];
-    }
 };
 
 // What two molecules in one relative placement give depends on nothing else, and the diagonals
 // of a search share most of their placements. Every two members of a diagonal sit at the offset
-// of one of their hits, so the joins of the hit placements that the diagonals use are worked
-// out once, before the scan, and the workers share them.
+// of one of their hits, so each hit placement has a slot, worked out by the first worker that
+// needs it and shared by all. Thread-safe.
 class CPlacementJoins {
   public:
-    // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order.
+    // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order. The
+    // sequences and the grid must outlive this object.
     CPlacementJoins(const std::vector<const std::vector<std::uint8_t>*>& sequences,
                     const CScoreGrid& grid, int cutoff,
-                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-                    const std::vector<CSimDiag>& diagonals);
+                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets);
 
     // Molecules a < b with residue p of a facing residue p + offset of b, where offset is one of
     // their hit offsets (std::logic_error otherwise).
-    const CPairJoin& Join(int a, int b, int offset) const;
+    const CPairJoin& Join(int a, int b, int offset);
 
   private:
+    enum : std::uint8_t { kMissing, kWorking, kReady };
     std::size_t IndexOf(int a, int b, int offset) const;
 
-    const std::vector<std::vector<std::vector<std::int32_t>>>& m_pairOffsets;
-    std::vector<std::size_t> m_firstOfPair;  // per pair a * count + b: its first join
-    std::vector<CPairJoin> m_joins;          // pair by pair, each in offset order; only those of
-                                             // the diagonals are worked out
+    const std::vector<const std::vector<std::uint8_t>*>& m_sequences;
+    const CScoreGrid& m_grid;
+    int m_cutoff;
+    std::size_t m_count;  // molecules
+    // The hit offsets of pair a < b are m_offsets[m_firstOfPair[p] .. m_firstOfPair[p + 1]) with
+    // p = a * m_count + b; m_joins and m_states hold their joins at the same indices.
+    std::vector<std::size_t> m_firstOfPair;
+    std::vector<std::int32_t> m_offsets;
+    std::vector<CPairJoin> m_joins;
+    std::unique_ptr<std::atomic<std::uint8_t>[]> m_states;
 };
 
 // Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the
 // longest molecule of the search; `minSequences` is at least 2.
-void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences,
-                  const CPlacementJoins& joins, std::vector<CBlockCandidate>& blocks);
+void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,
+                  std::vector<CBlockCandidate>& blocks);

@@ -147,7 +147,7 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     std::vector<std::vector<std::vector<std::int32_t>>> offsets(
         3, std::vector<std::vector<std::int32_t>>(3, std::vector<std::int32_t>{0}));
     for (int minimum : {2, 3}) {
-        const CPlacementJoins joins(sequences, grid, 4, offsets, {diagonal});
+        CPlacementJoins joins(sequences, grid, 4, offsets);
         std::vector<CBlockCandidate> blocks;
         ScanDiagonal(diagonal, 30, minimum, joins, blocks);
         ASSERT_EQ(blocks.size(), 1u) << minimum;
@@ -160,7 +160,7 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     // Without the third member only the pair is joined: a block of two, or none with S = 3.
     const auto unrelated = Codes(std::string(30, 'X'));
     const std::vector<const std::vector<std::uint8_t>*> pairOnly{&first, &second, &unrelated};
-    const CPlacementJoins joins(pairOnly, grid, 4, offsets, {diagonal});
+    CPlacementJoins joins(pairOnly, grid, 4, offsets);
     std::vector<CBlockCandidate> blocks;
     ScanDiagonal(diagonal, 30, 3, joins, blocks);
     EXPECT_TRUE(blocks.empty());
