@@ -338,4 +338,14 @@ TEST(BlockTableProgram, EveryStreamIsCompleteAndStatusesAreKept) {
     EXPECT_NE(usage.err.find("--threads"), std::string::npos) << usage.err;
 }
 
+TEST(BlockTableProgram, OutputThatCannotBeWrittenIsAFailure) {
+    if (!fs::exists("/dev/full"))
+        GTEST_SKIP() << "no /dev/full here";
+    const std::string command =
+        std::string(TB_CLI_PATH) + " search --quiet '" + kGlobins + "' > /dev/full 2> /dev/null";
+    const int status = std::system(command.c_str());
+    ASSERT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 2);
+}
+
 }  // namespace
