@@ -21,6 +21,10 @@ std::int32_t NewIdentifier() {
 
 CSimBlock::CSimBlock() : m_identifier(NewIdentifier()) {}
 
+void CSimBlock::TakeNewIdentifier() {
+    m_identifier = NewIdentifier();
+}
+
 void CSimBlock::ReserveIdentifier(int identifier) {
     std::int32_t last = g_lastIdentifier.load();
     while (last < identifier && !g_lastIdentifier.compare_exchange_weak(last, identifier)) {

@@ -25,6 +25,11 @@ class CSimBlock : public CSerializable {
 
     // A block with a new identifier, no members, empty name and no colour.
     CSimBlock();
+    // The same without an identifier until TakeNewIdentifier(): blocks made on several threads
+    // take theirs in the order the search makes them.
+    struct CDeferredIdentifier {};
+    explicit CSimBlock(CDeferredIdentifier) : m_identifier(0) {}
+    void TakeNewIdentifier();
     // Copies keep the identifier: links and coloured ranges find the copy by it.
     CSimBlock(const CSimBlock&) = default;
     CSimBlock& operator=(const CSimBlock&) = default;

@@ -222,24 +222,28 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
     const int longest = LongestSequenceLength();
     const int workers = WorkerCount(m_threadCount);
     CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets);
-    using CCandidates = std::vector<CBlockCandidate>;
-    const std::function<CCandidates(std::size_t, int)> scan = [&](std::size_t k, int) {
-        CCandidates candidates;
+    using CBlocks = std::vector<std::unique_ptr<CSimBlock>>;
+    // Blocks are built by the workers; identifiers are handed out here, in diagonal order.
+    const std::function<CBlocks(std::size_t, int)> scan = [&](std::size_t k, int) {
+        std::vector<CBlockCandidate> candidates;
         ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins, candidates);
-        return candidates;
+        CBlocks made;
+        for (CBlockCandidate& candidate : candidates) {
+            made.push_back(std::make_unique<CSimBlock>(CSimBlock::CDeferredIdentifier{}));
+            made.back()->Init(std::move(candidate.molecules), std::move(candidate.starts),
+                              candidate.width, candidate.score, 0);
+        }
+        return made;
     };
-    std::vector<std::unique_ptr<CSimBlock>> blocks;
+    CBlocks blocks;
     bool stopped = false;
-    const std::function<bool(std::size_t, CCandidates&)> make = [&](std::size_t k,
-                                                                    CCandidates& candidates) {
+    const std::function<bool(std::size_t, CBlocks&)> make = [&](std::size_t k, CBlocks& made) {
         ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)",
                        static_cast<int>(k) + 1, total);
-        // Made here, in diagonal order, so that identifiers follow the order blocks are made.
-        for (CBlockCandidate& candidate : candidates) {
-            m_heldBytes += BlockBytes(candidate.molecules.size());
-            blocks.push_back(std::make_unique<CSimBlock>());
-            blocks.back()->Init(std::move(candidate.molecules), std::move(candidate.starts),
-                                candidate.width, candidate.score, 0);
+        for (std::unique_ptr<CSimBlock>& block : made) {
+            block->TakeNewIdentifier();
+            m_heldBytes += BlockBytes(block->MemberCount());
+            blocks.push_back(std::move(block));
         }
         if (OutOfRoom()) {
             StopOutOfRoom();

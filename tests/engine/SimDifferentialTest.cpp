@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <random>
 
 #include "SimBlockParameters.h"
@@ -16,14 +17,23 @@ namespace {
 
 using literal::CSearchInput;
 
+// The blocks with the order they were made in: the rank of their identifier, since a search
+// hands identifiers out in that order, however many threads make the blocks.
 std::vector<literal::CBlock> BlocksOf(const CSimBlockSet& set) {
+    std::vector<int> identifiers;
+    for (int i = 0; i < set.BlockCount(); ++i)
+        identifiers.push_back(set.BlockAt(i)->Identifier());
+    std::sort(identifiers.begin(), identifiers.end());
     std::vector<literal::CBlock> blocks;
     for (int i = 0; i < set.BlockCount(); ++i) {
         const CSimBlock& block = *set.BlockAt(i);
+        const auto rank =
+            std::lower_bound(identifiers.begin(), identifiers.end(), block.Identifier());
         blocks.push_back(
             {std::vector<int>(block.Members().begin(), block.Members().end()),
              std::vector<int>(block.OriginalStarts().begin(), block.OriginalStarts().end()),
-             block.Width(CSimBlock::kOriginal), block.Score(CSimBlock::kOriginal)});
+             block.Width(CSimBlock::kOriginal), block.Score(CSimBlock::kOriginal),
+             static_cast<int>(rank - identifiers.begin())});
     }
     return blocks;
 }

@@ -201,6 +201,7 @@ class CLiteralSearch {
             }
         }
         auto& blocks = m_result.blocks;
+        block.made = static_cast<int>(blocks.size());
         auto greater = [&](const CBlock& other) {
             const auto mine = static_cast<std::int16_t>(block.molecules.size());
             const auto theirs = static_cast<std::int16_t>(other.molecules.size());

@@ -25,6 +25,7 @@ struct CBlock {
     std::vector<int> starts;
     int width = 0;
     int score = 0;
+    int made = 0;  // how many blocks were made before this one
     bool operator==(const CBlock&) const = default;
 };
 
