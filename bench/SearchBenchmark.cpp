@@ -84,13 +84,19 @@ std::vector<CSxMolEntry> ReadFasta(const std::string& path) {
     return molecules;
 }
 
-void BM_PairScan(benchmark::State& state) {
-    const CScoreMatrix matrix("blosum62mt");
-    const CScoreGrid grid = GridOf(matrix);
+// Two random proteins of `length` residues, encoded against `matrix`.
+std::vector<std::vector<std::uint8_t>> EncodedPair(const CScoreMatrix& matrix, int length) {
     std::mt19937 random(7);
     std::vector<std::vector<std::uint8_t>> codes(2);
     for (auto& sequence : codes)
-        matrix.Encode(RandomProtein(random, static_cast<int>(state.range(0))), sequence);
+        matrix.Encode(RandomProtein(random, length), sequence);
+    return codes;
+}
+
+void BM_PairScan(benchmark::State& state) {
+    const CScoreMatrix matrix("blosum62mt");
+    const CScoreGrid grid = GridOf(matrix);
+    const auto codes = EncodedPair(matrix, static_cast<int>(state.range(0)));
     const CPairScanner scanner(grid, 33, {&codes[0], &codes[1]});
     std::vector<std::int32_t> offsets;
     for (auto _ : state) {
@@ -106,10 +112,7 @@ BENCHMARK(BM_PairScan)->Arg(300)->Arg(1000)->Arg(5000);
 void BM_PairScanScalar(benchmark::State& state) {
     const CScoreMatrix matrix("blosum62mt");
     const CScoreGrid grid = GridOf(matrix);
-    std::mt19937 random(7);
-    std::vector<std::vector<std::uint8_t>> codes(2);
-    for (auto& sequence : codes)
-        matrix.Encode(RandomProtein(random, 1000), sequence);
+    const auto codes = EncodedPair(matrix, 1000);
     for (auto _ : state)
         benchmark::DoNotOptimize(ScanPairScalar(codes[0], codes[1], grid, 33));
     state.counters["residue_pairs_per_s"] =

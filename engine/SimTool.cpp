@@ -103,6 +103,13 @@ int CSimTool::Run() {
     }
 }
 
+std::vector<const std::vector<std::uint8_t>*> CSimTool::EncodedSequences() const {
+    std::vector<const std::vector<std::uint8_t>*> sequences;
+    for (const CSimMol& molecule : m_molecules)
+        sequences.push_back(&molecule.Codes());
+    return sequences;
+}
+
 int CSimTool::Fail(Failure failure) {
     m_failure = failure;
     return Finish(0);
@@ -130,10 +137,7 @@ void CSimTool::ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& canc
     const int total = static_cast<int>(pairs.size());
     BeginPhase("Performing pairwise comparisons...", 0, total, 1);
 
-    std::vector<const std::vector<std::uint8_t>*> sequences;
-    for (const CSimMol& molecule : m_molecules)
-        sequences.push_back(&molecule.Codes());
-    const CPairScanner scanner(grid, m_cutoff, sequences);
+    const CPairScanner scanner(grid, m_cutoff, EncodedSequences());
     m_pairOffsets.assign(count, std::vector<std::vector<std::int32_t>>(count));
 
     using COffsets = std::vector<std::int32_t>;
@@ -216,9 +220,7 @@ void CSimTool::StopOutOfRoom() {
 bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
     const int total = static_cast<int>(m_diagonals.size());
     BeginPhase("Scanning each diagonal for blocks...", 0, total, 1);
-    std::vector<const std::vector<std::uint8_t>*> sequences;
-    for (const CSimMol& molecule : m_molecules)
-        sequences.push_back(&molecule.Codes());
+    const std::vector<const std::vector<std::uint8_t>*> sequences = EncodedSequences();
     const int longest = LongestSequenceLength();
     const int workers = WorkerCount(m_threadCount);
     CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets);

@@ -101,6 +101,8 @@ class CSimTool {
 
   private:
     bool EncodeMolecules();
+    // The molecules' codes, in molecule order.
+    std::vector<const std::vector<std::uint8_t>*> EncodedSequences() const;
     // The phases; false when the run must end at once (the failure is recorded).
     void ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& cancelled);
     bool ExpandDiagonals(const CHitMasks& masks, bool& cancelled);

@@ -52,20 +52,25 @@ std::uint64_t GroupRootedAt(int root, std::uint64_t component) {
     return lowest && several ? component : 0;
 }
 
-// Whether a and b are connected through joins.
-bool Connected(int a, int b, const std::uint64_t* joins) {
-    std::uint64_t reached = std::uint64_t{1} << a;
+// The members connected to `start` through joins (itself too); the search ends early once it
+// reaches a member of `enough`.
+std::uint64_t ReachedFrom(int start, const std::uint64_t* joins, std::uint64_t enough = 0) {
+    std::uint64_t reached = std::uint64_t{1} << start;
     std::uint64_t frontier = reached;
-    while (frontier != 0) {
+    while (frontier != 0 && (reached & enough) == 0) {
         const int node = std::countr_zero(frontier);
         frontier &= frontier - 1;
         const std::uint64_t next = joins[node] & ~reached;
-        if ((next >> b) & 1)
-            return true;
         reached |= next;
         frontier |= next;
     }
-    return false;
+    return reached;
+}
+
+// Whether a and b are connected through joins.
+bool Connected(int a, int b, const std::uint64_t* joins) {
+    const std::uint64_t bitB = std::uint64_t{1} << b;
+    return (ReachedFrom(a, joins, bitB) & bitB) != 0;
 }
 
 class CDiagonalScanner {
@@ -167,15 +172,7 @@ class CDiagonalScanner {
         for (int t = 0; t < count; ++t) {
             if ((done >> t) & 1)
                 continue;
-            std::uint64_t reached = std::uint64_t{1} << t;
-            std::uint64_t frontier = reached;
-            while (frontier != 0) {
-                const int node = std::countr_zero(frontier);
-                frontier &= frontier - 1;
-                const std::uint64_t next = joins[node] & ~reached;
-                reached |= next;
-                frontier |= next;
-            }
+            const std::uint64_t reached = ReachedFrom(t, joins);
             for (std::uint64_t rest = reached; rest != 0; rest &= rest - 1)
                 component[std::countr_zero(rest)] = reached;
             done |= reached;

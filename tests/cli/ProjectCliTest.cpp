@@ -9,6 +9,7 @@
 #include <sstream>
 
 #include "BlockProject.h"
+#include "TextLines.h"
 #include "archive/FileIO.h"
 #include "cli/CliRun.h"
 
@@ -19,14 +20,6 @@ namespace {
 std::string ReadText(const std::string& path) {
     const std::vector<std::uint8_t> bytes = ReadWholeFile(path);
     return std::string(bytes.begin(), bytes.end());
-}
-
-std::vector<std::string> Lines(const std::string& text) {
-    std::vector<std::string> lines;
-    std::istringstream in(text);
-    for (std::string line; std::getline(in, line);)
-        lines.push_back(line);
-    return lines;
 }
 
 // The published GCG checksum, written out independently of the exporter.

@@ -14,6 +14,7 @@
 
 #include "QuilterParams.h"
 #include "ScoreMatrix.h"
+#include "TextLines.h"
 #include "archive/FileIO.h"
 #include "cli/CliRun.h"
 
@@ -32,14 +33,6 @@ std::vector<std::string> Split(const std::string& text, char separator) {
     if (!text.empty() && text.back() == separator)
         parts.push_back("");
     return parts;
-}
-
-std::vector<std::string> Lines(const std::string& text) {
-    std::vector<std::string> lines;
-    std::istringstream in(text);
-    for (std::string line; std::getline(in, line);)
-        lines.push_back(line);
-    return lines;
 }
 
 // Name -> sequence of a FASTA file (the first word of the title line).

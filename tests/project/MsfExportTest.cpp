@@ -4,19 +4,12 @@
 #include <fstream>
 #include <sstream>
 
+#include "TextLines.h"
 #include "archive/FileIO.h"
 #include "layout/AlignmentLayout.h"
 #include "msf/MsfExport.h"
 
 namespace {
-
-std::vector<std::string> Lines(const std::string& text) {
-    std::vector<std::string> lines;
-    std::istringstream in(text);
-    for (std::string line; std::getline(in, line);)
-        lines.push_back(line);
-    return lines;
-}
 
 std::string Repeat(const std::string& unit, int times) {
     std::string text;
