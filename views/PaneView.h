@@ -9,6 +9,7 @@
 #include "CommandTarget.h"
 
 class CBlockProject;
+class IPrintableRows;
 
 // Pane numbers, the numbers of the layout strings.
 enum PaneNumber : int {
@@ -59,6 +60,9 @@ class CPaneView : public QWidget, public ICommandTarget {
     // (positions are residue positions, `last` exclusive). Panes without sequences keep these.
     virtual std::optional<CResidueSelection> SelectionForBroadcast() const { return {}; }
     virtual bool ShowReceivedSelection(const CResidueSelection&) { return false; }
+
+    // The rows that printing and figure export draw; null for panes that print nothing.
+    virtual const IPrintableRows* PrintableRows() const { return nullptr; }
 
     bool UpdateCommand(int id, CCommandState& state) override;
     void RunCommand(int id) override;
