@@ -212,6 +212,7 @@ void CMainFrame::CreatePanes() {
     for (CPaneView* pane : m_panes) {
         m_document.AddView(pane);
         m_viewManager->AddPane(pane);
+        pane->SetActionLookup([this](int id) { return m_router.Action(id); });
         connect(pane, &CPaneView::activatePaneRequested, this, &CMainFrame::ActivatePane);
     }
     auto* text = static_cast<CBlockTextView*>(m_panes[kTextPane]);

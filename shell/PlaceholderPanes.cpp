@@ -185,15 +185,6 @@ CBlockSchemView::CBlockSchemView(QWidget* parent) : CPaneView(kSchemPane, parent
     setBackgroundRole(QPalette::Base);
 }
 
-CBlockAlnView::CBlockAlnView(QWidget* parent) : CPaneView(kAlnPane, parent) {
-    setAutoFillBackground(true);
-    setBackgroundRole(QPalette::Base);
-}
-
 void CBlockSchemView::paintEvent(QPaintEvent*) {
-    PaintPaneTitle(this);
-}
-
-void CBlockAlnView::paintEvent(QPaintEvent*) {
     PaintPaneTitle(this);
 }

@@ -1,11 +1,12 @@
 #pragma once
-// Plain stand-ins for the four panes: the text pane lists the project's molecules (the
-// program's molecule selection), the block list shows the blocks in a table, the schematic and
-// alignment panes are empty.
+// Plain stand-ins for three panes: the text pane lists the project's molecules (the program's
+// molecule selection), the block list shows the blocks in a table, the schematic pane is empty.
+// The alignment pane is the real one.
 
 #include <QTableWidget>
 #include <QTreeWidget>
 
+#include "AlignmentPane.h"
 #include "MoleculeSelection.h"
 #include "PaneView.h"
 
@@ -50,15 +51,6 @@ class CBlockSchemView : public CPaneView {
     Q_OBJECT
   public:
     explicit CBlockSchemView(QWidget* parent = nullptr);
-
-  protected:
-    void paintEvent(QPaintEvent* event) override;
-};
-
-class CBlockAlnView : public CPaneView {
-    Q_OBJECT
-  public:
-    explicit CBlockAlnView(QWidget* parent = nullptr);
 
   protected:
     void paintEvent(QPaintEvent* event) override;

@@ -3,12 +3,14 @@
 // moves them between splitters and tabs, the document tells them when the project changed.
 
 #include <QWidget>
+#include <functional>
 #include <optional>
 #include <string>
 
 #include "CommandTarget.h"
 
 class CBlockProject;
+class QAction;
 class IPrintableRows;
 
 // Pane numbers, the numbers of the layout strings.
@@ -67,6 +69,11 @@ class CPaneView : public QWidget, public ICommandTarget {
     bool UpdateCommand(int id, CCommandState& state) override;
     void RunCommand(int id) override;
 
+    // The frame's action of a command, for the panes' context menus; null when there is none.
+    using ActionLookup = std::function<QAction*(int id)>;
+    void SetActionLookup(ActionLookup lookup) { m_actionLookup = std::move(lookup); }
+    QAction* CommandAction(int id) const { return m_actionLookup ? m_actionLookup(id) : nullptr; }
+
   signals:
     // The pane asks the frame to make another pane active (F6).
     void activatePaneRequested(int paneNumber);
@@ -74,4 +81,5 @@ class CPaneView : public QWidget, public ICommandTarget {
   private:
     int m_paneNumber;
     IPaneDocument* m_document = nullptr;
+    ActionLookup m_actionLookup;
 };

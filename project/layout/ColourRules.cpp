@@ -14,13 +14,17 @@ std::uint32_t CombineColours(std::span<const CSimColorSegment> segments,
         if (!applies(segment))
             continue;
         const std::uint32_t c = colourOf(segment.BlockIdentifier());
-        colour = found ? ((~colour & 0xFFFFFFu) ^ c) : c;
+        colour = found ? OverlayColour(colour, c) : c;
         found = true;
     }
     return colour;
 }
 
 }  // namespace
+
+std::uint32_t OverlayColour(std::uint32_t soFar, std::uint32_t next) {
+    return (~soFar & 0xFFFFFFu) ^ next;
+}
 
 std::uint32_t ColourAtPosition(int position, std::span<const CSimColorSegment> segments,
                                const BlockColourLookup& colourOf) {

@@ -18,6 +18,9 @@ class CSimColorSegment : public CSimSegment {
 // The colour of the block with an identifier, or kNoColour when there is no such block.
 using BlockColourLookup = std::function<std::uint32_t(int blockIdentifier)>;
 
+// A further range's colour c laid over the colour x so far: (not x, limited to 24 bits) xor c.
+std::uint32_t OverlayColour(std::uint32_t soFar, std::uint32_t next);
+
 // The background of a residue: the first range that holds it gives its colour c; each further
 // one turns the colour x so far into (not x, limited to 24 bits) xor c. kNoColour when no
 // range holds it.

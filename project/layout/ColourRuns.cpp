@@ -1,0 +1,55 @@
+#include "layout/ColourRuns.h"
+
+#include <algorithm>
+#include <set>
+
+CColourRuns::CColourRuns(std::span<const CSimColorSegment> segments,
+                         const BlockColourLookup& colourOf) {
+    struct Event {
+        int position;
+        int segment;
+        bool starts;
+    };
+    std::vector<Event> events;
+    std::vector<std::uint32_t> colours;
+    for (int i = 0; i < static_cast<int>(segments.size()); ++i) {
+        const CSimColorSegment& s = segments[i];
+        colours.push_back(colourOf(s.BlockIdentifier()));
+        if (s.Length() <= 0)
+            continue;
+        events.push_back({s.Start(), i, true});
+        events.push_back({s.Start() + s.Length(), i, false});
+    }
+    std::sort(events.begin(), events.end(),
+              [](const Event& a, const Event& b) { return a.position < b.position; });
+    // The ranges holding the current run, in their own order: the order decides the colour.
+    std::set<int> active;
+    for (std::size_t e = 0; e < events.size();) {
+        const int position = events[e].position;
+        for (; e < events.size() && events[e].position == position; ++e) {
+            if (events[e].starts)
+                active.insert(events[e].segment);
+            else
+                active.erase(events[e].segment);
+        }
+        std::uint32_t colour = kNoColour;
+        bool found = false;
+        for (int segment : active) {
+            colour = found ? OverlayColour(colour, colours[segment]) : colours[segment];
+            found = true;
+        }
+        m_starts.push_back(position);
+        m_colours.push_back(colour);
+    }
+}
+
+std::uint32_t CColourRuns::ColourAt(int position) const {
+    auto it = std::upper_bound(m_starts.begin(), m_starts.end(), position);
+    if (it == m_starts.begin())
+        return kNoColour;
+    return m_colours[static_cast<std::size_t>(it - m_starts.begin()) - 1];
+}
+
+bool CColourRuns::IsBoundary(int position) const {
+    return std::binary_search(m_starts.begin(), m_starts.end(), position);
+}
