@@ -17,6 +17,7 @@ const QList<CCommandInfo> kCommands = {
     {ID_FILE_PAGE_SETUP, "Page Set&up...", "", "Change the page layout, header and footer\nPage Setup", "", false},
     {ID_FILE_PRINT, "&Print...", "Ctrl+P", "Print the active pane\nPrint", "print", false},
     {ID_FILE_PRINT_PREVIEW, "Print Pre&view", "", "Show the printed pages of the active pane\nPrint Preview", "print-preview", false},
+    {ID_FILE_EXPORT_PDF, "Export to P&DF...", "", "Write the printed pages of the active pane to a PDF file\nExport to PDF", "", false},
     {ID_FILE_PRINT_SETUP, "P&rint Setup...", "", "Choose the printer and its options\nPrint Setup", "", false},
     {ID_FILE_MRU_FILE1, "Recent File", "", "Open this project\nRecent File", "", false},
     {ID_FILE_MRU_FILE1 + 1, "Recent File", "", "Open this project\nRecent File", "", false},

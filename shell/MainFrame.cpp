@@ -24,6 +24,7 @@
 #include "Settings.h"
 #include "TcxMsgBox.h"
 #include "ViewManager.h"
+#include "print/PrintCommands.h"
 
 namespace {
 
@@ -37,6 +38,12 @@ const char kRestoreText[] = "&Restore Layout        Alt+F6";
 // Pasted sequences go through a file of this name, in a folder made for each paste.
 const char kClipboardFileName[] = "_clipseq";
 constexpr qsizetype kMaxClipboardBytes = 0x7FFFFFFF;
+
+CPrintSetup PrintSetupOf(const CPageSetup& page) {
+    return PrintSetupFromStored(page.marginL, page.marginR, page.marginT, page.marginB,
+                                page.isMetric != 0, page.header, page.footer, page.pageSizeX,
+                                page.pageSizeY);
+}
 
 }  // namespace
 
@@ -108,6 +115,7 @@ void CMainFrame::CreateMenus() {
                   ID_FILE_PAGE_SETUP,
                   ID_FILE_PRINT,
                   ID_FILE_PRINT_PREVIEW,
+                  ID_FILE_EXPORT_PDF,
                   ID_FILE_PRINT_SETUP,
                   0,
                   ID_FILE_MRU_FILE1,
@@ -357,6 +365,11 @@ bool CMainFrame::UpdateCommand(int id, CCommandState& state) {
         case ID_BROADCAST_SELECTION:
             state.enabled = m_panes[kAlnPane]->SelectionForBroadcast().has_value();
             return true;
+        case ID_FILE_PRINT:
+        case ID_FILE_PRINT_PREVIEW:
+        case ID_FILE_EXPORT_PDF:
+            state.enabled = m_activePane && CanPrint(m_activePane->PrintableRows());
+            return true;
         case ID_WEB_LINKS:
         case ID_WEB_LINK_1:
         case ID_WEB_LINK_2:
@@ -409,6 +422,17 @@ void CMainFrame::RunCommand(int id) {
         case ID_BROADCAST_SELECTION:
             SendBroadcast();
             break;
+        case ID_FILE_PRINT:
+        case ID_FILE_PRINT_PREVIEW:
+        case ID_FILE_EXPORT_PDF: {
+            const QString error =
+                RunPrintCommand(id, this, m_app.Printer(), *m_activePane->PrintableRows(),
+                                PrintSetupOf(m_settings.LoadPageSetup()), m_document.PathName());
+            if (!error.isEmpty()) {
+                CTcxMsgBox::Show(this, error, MB_OK | MB_ICONEXCLAMATION);
+            }
+            break;
+        }
         case ID_WEB_LINKS:
         case ID_START_PAGE:
             m_app.OpenHelpPage(QStringLiteral("index.html"));

@@ -18,6 +18,7 @@ enum CommandId : int {
     ID_LOAD_LOCAL_DATABASE = 22235,
     ID_EXPORT_MOLECULES = 32772,
     ID_EXPORT_MSF = 32825,
+    ID_FILE_EXPORT_PDF = 32860,  // the active pane's printed pages as a PDF file
 
     ID_EDIT_UNDO = 57643,
     ID_EDIT_CUT = 57635,
