@@ -44,6 +44,9 @@ CColourRuns::CColourRuns(std::span<const CSimColorSegment> segments,
 }
 
 std::uint32_t CColourRuns::ColourAt(int position) const {
+    // Ranges hold no position before the first residue, wherever they start.
+    if (position < 0)
+        return kNoColour;
     auto it = std::upper_bound(m_starts.begin(), m_starts.end(), position);
     if (it == m_starts.begin())
         return kNoColour;
