@@ -45,21 +45,6 @@ std::optional<std::string> HeaderLetters(std::string_view line) {
     return letters;
 }
 
-// The lines that carry data: without "\r" endings, empty lines and lines holding a "#".
-std::vector<std::string_view> DataLines(std::string_view text) {
-    std::vector<std::string_view> lines;
-    while (!text.empty()) {
-        const std::size_t end = std::min(text.find('\n'), text.size());
-        std::string_view line = text.substr(0, end);
-        text.remove_prefix(std::min(end + 1, text.size()));
-        if (!line.empty() && line.back() == '\r')
-            line.remove_suffix(1);
-        if (!line.empty() && line.find('#') == std::string_view::npos)
-            lines.push_back(line);
-    }
-    return lines;
-}
-
 // The file name up to its first ".".
 std::string TitleOf(const std::string& path) {
     const std::string name = FileNameOf(path);
@@ -178,12 +163,7 @@ bool CScoreMatrix::Equals(const CScoreMatrix& other) const {
 std::optional<int> CScoreMatrix::DefaultCutoff() const {
     if (m_frequencies.Count() < kWindowLength || m_size == 0)
         return std::nullopt;
-    int largest = ScoreAt(0, 0);
-    for (int row = 0; row < m_size; ++row) {
-        for (int column = 0; column <= row; ++column)
-            largest = std::max(largest, ScoreAt(row, column));
-    }
-    return ToInt(static_cast<double>(largest) * kWindowLength);
+    return ToInt(static_cast<double>(LargestLowerScore()) * kWindowLength);
 }
 
 std::optional<int> CScoreMatrix::ExpectedWindowScore() const {
@@ -242,10 +222,10 @@ bool CScoreMatrix::ReadTextFile(const std::string& path) {
 }
 
 bool CScoreMatrix::ReadText(std::string_view text, const std::string& name) {
-    const std::vector<std::string_view> lines = DataLines(text);
+    const std::vector<CTextLine> lines = DataLines(text);
     std::size_t header = 0;
     std::optional<std::string> letters;
-    while (header < lines.size() && !(letters = HeaderLetters(lines[header])))
+    while (header < lines.size() && !(letters = HeaderLetters(lines[header].text)))
         ++header;
     if (!letters) {
         m_lastError = "no header line with the matrix letters";
@@ -254,43 +234,91 @@ bool CScoreMatrix::ReadText(std::string_view text, const std::string& name) {
     CScoreMatrix result(*this);
     result.m_name = name;
     if (!result.SetAlphabet(*letters)) {
-        m_lastError = "more than " + std::to_string(kMaxLetters) + " letters in the header line";
+        m_lastError = "line " + std::to_string(lines[header].number) + ": more than " +
+                      std::to_string(kMaxLetters) + " letters in the header line";
         return false;
     }
     result.ResetScores();
     std::size_t next = header + 1;
-    for (int row = 0; row < result.m_size && next < lines.size(); ++row, ++next) {
-        if (!result.ReadRow(row, lines[next])) {
+    for (int row = 0; row < result.m_size; ++row, ++next) {
+        const bool read = next < lines.size() ? result.ReadRow(row, lines[next])
+                                              : result.MissingRow(row, lines.back().number);
+        if (!read) {
             m_lastError = result.m_lastError;
             return false;
         }
     }
-    result.m_statistics.Clear();
-    for (; next < lines.size(); ++next)
-        result.m_statistics.ReadTextLine(lines[next]);
+    const std::vector<CTextLine> statistics(lines.begin() + static_cast<std::ptrdiff_t>(next),
+                                            lines.end());
+    std::string error;
+    if (!result.m_statistics.ReadTextLines(statistics, error)) {
+        m_lastError = error;
+        return false;
+    }
+    if (!result.CheckDefaultCutoff()) {
+        m_lastError = result.m_lastError;
+        return false;
+    }
     result.m_lastError.clear();
     *this = std::move(result);
     return true;
 }
 
-bool CScoreMatrix::ReadRow(int row, std::string_view line) {
-    const std::vector<std::string_view> tokens = SplitTokens(line);
-    if (tokens.empty() || tokens.front().front() != m_alphabet[row])
-        return true;
-    if (tokens.size() - 1 > static_cast<std::size_t>(m_size)) {
-        m_lastError = "row " + std::string(1, m_alphabet[row]) + " has more than " +
-                      std::to_string(m_size) + " values";
+bool CScoreMatrix::ReadRow(int row, const CTextLine& line) {
+    const std::string where = "line " + std::to_string(line.number) + ": ";
+    const std::string letter(1, m_alphabet[row]);
+    const std::vector<std::string_view> tokens = SplitTokens(line.text);
+    if (tokens.empty() || tokens.front() != letter) {
+        m_lastError = where + "row " + letter + " expected, found \"" +
+                      std::string(line.text.substr(0, 20)) + "\"";
         return false;
     }
-    for (std::size_t column = 0; column + 1 < tokens.size(); ++column) {
-        const std::optional<std::int32_t> score = LeadingInteger(tokens[column + 1]);
-        if (!score) {
-            m_lastError = "score out of range in row " + std::string(1, m_alphabet[row]);
+    const std::size_t values = tokens.size() - 1;
+    if (values != static_cast<std::size_t>(m_size)) {
+        m_lastError = where + "row " + letter + " has " + std::to_string(values) + " values, " +
+                      std::to_string(m_size) + " expected";
+        return false;
+    }
+    for (std::size_t column = 0; column < values; ++column) {
+        const std::string_view token = tokens[column + 1];
+        std::int32_t score = 0;
+        const NumberParse parsed = ParseInteger(token, score);
+        if (parsed != NumberParse::ok) {
+            m_lastError = where + "\"" + std::string(token) + "\" in row " + letter +
+                          (parsed == NumberParse::outOfRange ? " is beyond 32 bits"
+                                                             : " is not a whole number");
             return false;
         }
-        SetScoreAt(row, static_cast<int>(column), *score);
+        SetScoreAt(row, static_cast<int>(column), score);
     }
     return true;
+}
+
+bool CScoreMatrix::MissingRow(int row, int lastLine) {
+    m_lastError = "the file ends at line " + std::to_string(lastLine) + " before row " +
+                  std::string(1, m_alphabet[row]) + " (row " + std::to_string(row + 1) + " of " +
+                  std::to_string(m_size) + ")";
+    return false;
+}
+
+bool CScoreMatrix::CheckDefaultCutoff() {
+    const std::int64_t cutoff = std::int64_t{kWindowLength} * LargestLowerScore();
+    if (cutoff >= 1 && cutoff <= std::numeric_limits<int>::max())
+        return true;
+    m_lastError = "the default cutoff, " + std::to_string(kWindowLength) +
+                  " times the largest score " + std::to_string(LargestLowerScore()) + ", is " +
+                  std::to_string(cutoff) +
+                  (cutoff < 1 ? "; a cutoff must be at least 1" : ", beyond 32 bits");
+    return false;
+}
+
+int CScoreMatrix::LargestLowerScore() const {
+    int largest = ScoreAt(0, 0);
+    for (int row = 0; row < m_size; ++row) {
+        for (int column = 0; column <= row; ++column)
+            largest = std::max(largest, ScoreAt(row, column));
+    }
+    return largest;
 }
 
 std::string CScoreMatrix::ToText() const {

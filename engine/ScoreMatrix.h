@@ -93,9 +93,13 @@ class CScoreMatrix : public CSerializable {
     bool Encode(std::string_view sequence, std::vector<std::uint8_t>& codes) const;
 
     // Reads a matrix text file. The name becomes the file name up to its first "."; type,
-    // comment and frequencies stay as they were. On failure (unreadable file, no header line,
-    // a row with more values than letters) the matrix is left unchanged, false is returned
-    // and LastError() says why.
+    // comment and frequencies stay as they were. The header line must be followed by one row
+    // per letter, in header order, each its letter and exactly one whole number per letter;
+    // every line after the rows must be a statistics line; the default cutoff must come out
+    // at 1 or more. On failure (an unreadable file, no header line, a missing, short, long or
+    // misplaced row, a value that is no whole number, a bad statistics line, a cutoff below 1)
+    // the matrix is left unchanged, false is returned and LastError() says why, naming the
+    // line.
     bool ReadTextFile(const std::string& path);
     // The same from text already in memory, naming the matrix `name`.
     bool ReadText(std::string_view text, const std::string& name);
@@ -128,9 +132,15 @@ class CScoreMatrix : public CSerializable {
   private:
     // Sizes the table for the current alphabet, every cell 0.
     void ResetScores();
-    // Reads the scores of row `row` from a row line; false (with m_lastError) on a line with
-    // more values than letters or a score beyond 32 bits.
-    bool ReadRow(int row, std::string_view line);
+    // Reads the scores of row `row` from its line; false (with m_lastError) when the line is
+    // not that row with one whole number per letter.
+    bool ReadRow(int row, const CTextLine& line);
+    // Says (false, m_lastError) that the file ended after `lastLine` before row `row`.
+    bool MissingRow(int row, int lastLine);
+    // False (with m_lastError) when the default cutoff would be below 1 or beyond an int.
+    bool CheckDefaultCutoff();
+    // The largest score of the lower triangle, the diagonal included.
+    int LargestLowerScore() const;
 
     std::string m_name;
     std::string m_alphabet;

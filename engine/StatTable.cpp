@@ -1,6 +1,29 @@
 #include "StatTable.h"
 
-#include "TextTokens.h"
+#include <unordered_map>
+
+namespace {
+
+// Entries set one after another as Set() does, in time linear in their number.
+class CEntryBuilder {
+  public:
+    void Set(const CStatConst& entry) {
+        const CStatConst copy(entry.sequences, entry.lambda, entry.k, entry.marked != 0);
+        const auto [found, added] = m_indexOf.emplace(entry.sequences, m_entries.size());
+        if (added) {
+            m_entries.push_back(std::make_unique<CStatConst>(copy));
+        } else {
+            *m_entries[found->second] = copy;
+        }
+    }
+    CStatSerialArray Take() { return std::move(m_entries); }
+
+  private:
+    CStatSerialArray m_entries;
+    std::unordered_map<std::int32_t, std::size_t> m_indexOf;
+};
+
+}  // namespace
 
 void CStatConst::Serialize(CArchive& ar) {
     ar.XMember(sequences);
@@ -34,10 +57,10 @@ CStatTable::CStatTable(const CStatTable& other) {
 CStatTable& CStatTable::operator=(const CStatTable& other) {
     if (this == &other)
         return *this;
-    Clear();
-    for (const auto& entry : other.m_constants) {
-        Set(entry->sequences, entry->lambda, entry->k, entry->marked != 0);
-    }
+    CEntryBuilder builder;
+    for (const auto& entry : other.m_constants)
+        builder.Set(*entry);
+    m_constants = builder.Take();
     m_reference = other.m_reference;
     return *this;
 }
@@ -82,15 +105,40 @@ void CStatTable::AppendText(std::string& out) const {
     }
 }
 
-bool CStatTable::ReadTextLine(std::string_view line) {
+std::string CStatTable::ParseTextLine(std::string_view line, CStatConst& entry) {
     const std::vector<std::string_view> tokens = SplitTokens(line);
     if (tokens.size() < 3)
-        return false;
-    const std::optional<std::int32_t> sequences = LeadingInteger(tokens[0]);
-    if (!sequences)
-        return false;
+        return "a statistics line needs the number of sequences, lambda and K";
+    std::int32_t sequences = 0;
+    if (ParseInteger(tokens[0], sequences) != NumberParse::ok || sequences < 1) {
+        return "the number of sequences \"" + std::string(tokens[0]) +
+               "\" is not a whole number from 1 to 2147483647";
+    }
+    double constants[2] = {};
+    const char* names[2] = {"lambda", "K"};
+    for (int i = 0; i < 2; ++i) {
+        const std::string_view token = tokens[1 + i];
+        if (!ParseNumber(token, constants[i]) || constants[i] < 0) {
+            return std::string(names[i]) + " \"" + std::string(token) +
+                   "\" is not a number of 0 or more";
+        }
+    }
     const bool marked = tokens.size() > 3 && tokens[3].find('*') != std::string_view::npos;
-    Set(*sequences, LeadingNumber(tokens[1]), LeadingNumber(tokens[2]), marked);
+    entry = CStatConst(sequences, constants[0], constants[1], marked);
+    return {};
+}
+
+bool CStatTable::ReadTextLines(const std::vector<CTextLine>& lines, std::string& error) {
+    CEntryBuilder builder;
+    for (const CTextLine& line : lines) {
+        CStatConst entry;
+        if (std::string why = ParseTextLine(line.text, entry); !why.empty()) {
+            error = "line " + std::to_string(line.number) + ": " + why;
+            return false;
+        }
+        builder.Set(entry);
+    }
+    m_constants = builder.Take();
     return true;
 }
 

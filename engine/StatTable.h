@@ -8,6 +8,7 @@
 #include <string_view>
 #include <vector>
 
+#include "TextTokens.h"
 #include "archive/Archive.h"
 
 // lambda and K for blocks of `sequences` sequences.
@@ -62,10 +63,16 @@ class CStatTable : public CSerializable {
 
     // Appends the statistics section of a matrix text file to `out` (nothing when empty).
     void AppendText(std::string& out) const;
-    // Reads one statistics line ("m lambda K [*]", split at blanks, commas and tabs) and sets
-    // its entry; a fourth token containing "*" marks it. Lines with fewer than three tokens,
-    // or whose m does not fit 32 bits, are ignored; returns whether an entry was set.
-    bool ReadTextLine(std::string_view line);
+    // One statistics line, split at blanks, commas and tabs: the number of sequences (a whole
+    // number, at least 1), lambda and K (numbers, not negative), then a token containing "*"
+    // when the entry is marked; further tokens are ignored. Empty when `entry` was read, else
+    // why the line is not a statistics line.
+    static std::string ParseTextLine(std::string_view line, CStatConst& entry);
+    // Replaces the entries by those of the statistics lines, in order; a later line for the
+    // same number of sequences replaces the earlier one in place. Takes time linear in the
+    // number of lines. On a malformed line the table stays as it was and `error` names the
+    // line and why.
+    bool ReadTextLines(const std::vector<CTextLine>& lines, std::string& error);
 
     void Serialize(CArchive& ar) override;
 

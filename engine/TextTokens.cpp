@@ -1,6 +1,8 @@
 #include "TextTokens.h"
 
+#include <algorithm>
 #include <charconv>
+#include <cmath>
 
 namespace {
 constexpr std::size_t kCommentPiece = 70;
@@ -9,9 +11,10 @@ bool IsSeparator(char c) {
     return c == ' ' || c == ',' || c == '\t';
 }
 
-// Drops a leading "+", which the classic conversions accept and from_chars does not.
+// Drops a leading "+", which the classic conversions accept and from_chars does not ("+-1"
+// stays as it is, and is no number).
 std::string_view WithoutPlus(std::string_view token) {
-    if (!token.empty() && token.front() == '+')
+    if (token.size() > 1 && token[0] == '+' && token[1] != '-')
         token.remove_prefix(1);
     return token;
 }
@@ -32,20 +35,38 @@ std::vector<std::string_view> SplitTokens(std::string_view line) {
     return tokens;
 }
 
-std::optional<std::int32_t> LeadingInteger(std::string_view token) {
-    token = WithoutPlus(token);
-    std::int32_t value = 0;
-    const auto result = std::from_chars(token.data(), token.data() + token.size(), value);
-    if (result.ec == std::errc::result_out_of_range)
-        return std::nullopt;
-    return result.ec == std::errc() ? value : 0;
+std::vector<CTextLine> DataLines(std::string_view text) {
+    std::vector<CTextLine> lines;
+    int number = 0;
+    while (!text.empty()) {
+        const std::size_t end = std::min(text.find_first_of("\r\n"), text.size());
+        const std::string_view line = text.substr(0, end);
+        std::size_t next = end + 1;
+        if (end + 1 < text.size() && text[end] == '\r' && text[end + 1] == '\n')
+            ++next;
+        text.remove_prefix(std::min(next, text.size()));
+        ++number;
+        if (!line.empty() && line.find('#') == std::string_view::npos)
+            lines.push_back({number, line});
+    }
+    return lines;
 }
 
-double LeadingNumber(std::string_view token) {
+NumberParse ParseInteger(std::string_view token, std::int32_t& value) {
     token = WithoutPlus(token);
-    double value = 0.0;
     const auto result = std::from_chars(token.data(), token.data() + token.size(), value);
-    return result.ec == std::errc() ? value : 0.0;
+    if (result.ec == std::errc::result_out_of_range)
+        return NumberParse::outOfRange;
+    if (result.ec != std::errc() || result.ptr != token.data() + token.size())
+        return NumberParse::notANumber;
+    return NumberParse::ok;
+}
+
+bool ParseNumber(std::string_view token, double& value) {
+    token = WithoutPlus(token);
+    const auto result = std::from_chars(token.data(), token.data() + token.size(), value);
+    return result.ec == std::errc() && result.ptr == token.data() + token.size() &&
+           std::isfinite(value);
 }
 
 std::string FixedNumber(double value, int decimals) {

@@ -11,11 +11,21 @@
 // The tokens of `line` between blanks, commas and tabs (empty tokens dropped).
 std::vector<std::string_view> SplitTokens(std::string_view line);
 
-// The integer at the start of `token` ("12abc" -> 12, "x" -> 0), as the classic C conversion
-// reads it; none when the number does not fit 32 bits.
-std::optional<std::int32_t> LeadingInteger(std::string_view token);
-// The decimal number at the start of `token` ("0.25x" -> 0.25, "x" -> 0).
-double LeadingNumber(std::string_view token);
+// One line of a text file with its number (the first line is 1), without its line end.
+struct CTextLine {
+    int number;
+    std::string_view text;
+};
+// The lines that carry data: empty lines and lines holding a "#" anywhere are left out. LF,
+// CR LF and CR each end a line.
+std::vector<CTextLine> DataLines(std::string_view text);
+
+enum class NumberParse { ok, notANumber, outOfRange };
+// The whole of `token` as a 32-bit integer: an optional sign, then decimal digits only.
+NumberParse ParseInteger(std::string_view token, std::int32_t& value);
+// The whole of `token` as a finite decimal number ("0.25", "-1", "2e-3"); false for
+// anything else.
+bool ParseNumber(std::string_view token, double& value);
 // `value` with exactly `decimals` digits after the point.
 std::string FixedNumber(double value, int decimals);
 

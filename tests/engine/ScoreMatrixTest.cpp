@@ -329,16 +329,13 @@ TEST(ScoreMatrixText, ReadsSmallAndIncompleteFiles) {
     EXPECT_EQ(matrix.Scores(), (std::vector<int>{4, -1, -1, 5}));
     EXPECT_EQ(matrix.Type(), kProteinType);  // kept from before
 
-    // Short rows, a row of another letter, a missing last row, CR LF line ends, commas.
-    ASSERT_TRUE(matrix.ReadTextFile(
-        dir.File("short.txt", "title line 1\r\n\r\n A  R  N\r\nA 1\r\nX 7 7 7\r\nN,3,2,1\r\n")));
+    // A title line before the header, CR LF line ends, blank lines, commas and signs.
+    ASSERT_TRUE(matrix.ReadTextFile(dir.File(
+        "crlf.txt", "title line 1\r\n\r\n A  R  N\r\nA 1 0 0\r\n\r\nR,+7,-7,7\r\nN,3,2,1\r\n")))
+        << matrix.LastError();
     EXPECT_EQ(matrix.Alphabet(), "ARN");
-    EXPECT_EQ(matrix.Scores(), (std::vector<int>{1, 0, 0, 0, 0, 0, 3, 2, 1}));
+    EXPECT_EQ(matrix.Scores(), (std::vector<int>{1, 0, 0, 7, -7, 7, 3, 2, 1}));
     EXPECT_TRUE(matrix.IsValid());
-
-    // Tokens read like C's atoi: leading digits count, anything else is 0.
-    ASSERT_TRUE(matrix.ReadTextFile(dir.File("atoi.txt", " A R\nA +7 x\nR 12ab -3\n")));
-    EXPECT_EQ(matrix.Scores(), (std::vector<int>{7, 0, 12, -3}));
 }
 
 TEST(ScoreMatrixText, FailuresKeepThePreviousMatrix) {
@@ -348,6 +345,7 @@ TEST(ScoreMatrixText, FailuresKeepThePreviousMatrix) {
         "# no header at all\n1 2 3\n",        // no header line
         "  A  R\nA 4 -1\nR -1 5 7\n",         // too many values in a row
         "  A  R\nA 4 99999999999\nR -1 5\n",  // score beyond 32 bits
+        "  A  R\nA 4\nR -1 5\n",              // too few values in a row
         " " + std::string(300, 'A') + "\n",   // more letters than codes
         "",                                   // empty file
     };
@@ -371,9 +369,9 @@ TEST(ScoreMatrixText, StatisticsLinesAfterTheRows) {
     ASSERT_TRUE(
         matrix.ReadText(" A\nA 1\n\t3\t0.2500\t0.0500\t*\n"
                         "5 0.1 0.2\n5,0.3,0.4\n"  // the later line for m 5 wins
-                        "6 0.5\n"                 // too few tokens
-                        "7 0.5 0.25 x extra\n",   // no mark
-                        "stats"));
+                        "7 0.5 0.25 x extra\n",   // no mark; further tokens ignored
+                        "stats"))
+        << matrix.LastError();
     double lambda = 0;
     double k = 0;
     ASSERT_EQ(matrix.Statistics().Count(), 3u);
@@ -384,7 +382,7 @@ TEST(ScoreMatrixText, StatisticsLinesAfterTheRows) {
     ASSERT_TRUE(matrix.Statistics().Lookup(5, lambda, k));
     EXPECT_EQ(lambda, 0.3);
     EXPECT_EQ(k, 0.4);
-    EXPECT_FALSE(matrix.Statistics().Lookup(6, lambda, k));
+    EXPECT_EQ(matrix.Statistics().Entries()[1]->sequences, 5);
     EXPECT_EQ(matrix.Statistics().Entries()[2]->marked, 0);
 
     // A new read replaces the statistics.

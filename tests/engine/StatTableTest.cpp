@@ -81,21 +81,24 @@ TEST(StatTable, TextLinesReadBackWhatIsWritten) {
     written.AppendText(text);
 
     CStatTable read;
-    std::size_t start = 0;
-    for (std::size_t end; (end = text.find('\n', start)) != std::string::npos; start = end + 1) {
-        const std::string line = text.substr(start, end - start);
-        if (line.find('#') == std::string::npos)
-            read.ReadTextLine(line);
-    }
+    std::string error;
+    ASSERT_TRUE(read.ReadTextLines(DataLines(text), error)) << error;
     EXPECT_EQ(EntriesOf(read), EntriesOf(written));
 
-    CStatTable marked;
-    EXPECT_TRUE(marked.ReadTextLine("\t3\t0.2500\t0.0500\t*"));
-    EXPECT_EQ(EntriesOf(marked), (std::vector<Entry>{{3, 0.25, 0.05, true}}));
-    EXPECT_FALSE(marked.ReadTextLine("3 0.25"));
-    EXPECT_FALSE(marked.ReadTextLine("99999999999 0.25 0.5"));  // m beyond 32 bits
-    EXPECT_TRUE(marked.ReadTextLine("3,0.5,0.75,no-mark,extra"));
-    EXPECT_EQ(EntriesOf(marked), (std::vector<Entry>{{3, 0.5, 0.75, false}}));
+    CStatConst entry;
+    EXPECT_EQ(CStatTable::ParseTextLine("\t3\t0.2500\t0.0500\t*", entry), "");
+    EXPECT_EQ((Entry{entry.sequences, entry.lambda, entry.k, entry.marked != 0}),
+              (Entry{3, 0.25, 0.05, true}));
+    EXPECT_NE(CStatTable::ParseTextLine("3 0.25", entry), "");
+    EXPECT_NE(CStatTable::ParseTextLine("99999999999 0.25 0.5", entry), "");  // m beyond 32 bits
+    EXPECT_EQ(CStatTable::ParseTextLine("3,0.5,0.75,no-mark,extra", entry), "");
+    EXPECT_EQ((Entry{entry.sequences, entry.lambda, entry.k, entry.marked != 0}),
+              (Entry{3, 0.5, 0.75, false}));
+
+    // A bad line leaves the table as it was.
+    EXPECT_FALSE(read.ReadTextLines(DataLines("3 0.5 0.5\n4 x 0.5\n"), error));
+    EXPECT_EQ(error, "line 2: lambda \"x\" is not a number of 0 or more");
+    EXPECT_EQ(EntriesOf(read), EntriesOf(written));
 
     std::string empty;
     CStatTable().AppendText(empty);
