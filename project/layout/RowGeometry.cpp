@@ -83,7 +83,7 @@ SelectionEdge SelectionEdgeAt(const CColumnAxis& axis, double x, CColumnRange se
     const double toStart = std::abs(x - ColumnLeft(axis, selection.start));
     const double toEnd = std::abs(x - ColumnLeft(axis, selection.end));
     const double reach = axis.scale / 2;
-    if (toStart > reach && toEnd > reach)
+    if (toStart >= reach && toEnd >= reach)
         return SelectionEdge::kNone;
     return toStart <= toEnd ? SelectionEdge::kStart : SelectionEdge::kEnd;
 }

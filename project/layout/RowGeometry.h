@@ -54,7 +54,8 @@ int FirstColumnToShow(int column, int firstColumn, int visibleColumns, int colum
 // -1, 0 or 1: whether `value` lies before, inside or after [low, high).
 int OutsideDirection(int value, int low, int high);
 
-// Which edge of a selection [start, end) lies within half a column of `x`.
+// Which edge of a selection [start, end) lies less than half a column from `x` (the middle of
+// a selection's first or last column is no longer on its edge).
 enum class SelectionEdge { kNone, kStart, kEnd };
 SelectionEdge SelectionEdgeAt(const CColumnAxis& axis, double x, CColumnRange selection);
 

@@ -95,14 +95,17 @@ TEST(RowGeometry, SelectionEdgesWithinHalfAColumn) {
     const double start = ColumnLeft(kAxis, 25);
     const double end = ColumnLeft(kAxis, 30);
     EXPECT_EQ(SelectionEdgeAt(kAxis, start + 4, selection), SelectionEdge::kStart);
-    EXPECT_EQ(SelectionEdgeAt(kAxis, start - 5, selection), SelectionEdge::kStart);
+    EXPECT_EQ(SelectionEdgeAt(kAxis, start - 4.9, selection), SelectionEdge::kStart);
+    EXPECT_EQ(SelectionEdgeAt(kAxis, start + 5, selection), SelectionEdge::kNone)
+        << "the middle of the first column";
     EXPECT_EQ(SelectionEdgeAt(kAxis, start + 6, selection), SelectionEdge::kNone);
     EXPECT_EQ(SelectionEdgeAt(kAxis, end - 3, selection), SelectionEdge::kEnd);
-    EXPECT_EQ(SelectionEdgeAt(kAxis, end + 5, selection), SelectionEdge::kEnd);
+    EXPECT_EQ(SelectionEdgeAt(kAxis, end + 4.9, selection), SelectionEdge::kEnd);
     EXPECT_EQ(SelectionEdgeAt(kAxis, end + 6, selection), SelectionEdge::kNone);
     EXPECT_EQ(SelectionEdgeAt(kAxis, start, CColumnRange{}), SelectionEdge::kNone);
     // A one-column selection: the nearer edge wins.
     EXPECT_EQ(SelectionEdgeAt(kAxis, start + 6, {25, 26}), SelectionEdge::kEnd);
+    EXPECT_EQ(SelectionEdgeAt(kAxis, start + 4, {25, 26}), SelectionEdge::kStart);
 }
 
 TEST(RowGeometry, NameArea) {
