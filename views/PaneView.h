@@ -8,6 +8,7 @@
 #include <string>
 
 #include "CommandTarget.h"
+#include "layout/Selection.h"
 
 class CBlockProject;
 class QAction;
@@ -62,6 +63,10 @@ class CPaneView : public QWidget, public ICommandTarget {
     // (positions are residue positions, `last` exclusive). Panes without sequences keep these.
     virtual std::optional<CResidueSelection> SelectionForBroadcast() const { return {}; }
     virtual bool ShowReceivedSelection(const CResidueSelection&) { return false; }
+
+    // The selected columns of the pane's rows, for the link, unlink and define-block commands;
+    // empty for panes without sequence rows.
+    virtual std::vector<ALN_BSEL_ENTRY> SelectionEntries() const { return {}; }
 
     // The rows that printing and figure export draw; null for panes that print nothing.
     virtual const IPrintableRows* PrintableRows() const { return nullptr; }

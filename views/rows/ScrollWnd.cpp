@@ -26,14 +26,3 @@ void CSepWnd::PaintCells(QPainter& painter, const CRowPaintContext& context) con
     painter.setPen(context.palette->color(QPalette::Mid));
     painter.drawLine(QPointF(0, context.top), QPointF(right - 1, context.top));
 }
-
-CBumperWnd::CBumperWnd(QString name, int height) : CScrollWnd(std::move(name)) {
-    SetRowHeight(height);
-}
-
-void CBumperWnd::PaintCells(QPainter& painter, const CRowPaintContext& context) const {
-    const QRectF cells(context.axis.areaLeft, context.top,
-                       (context.endColumn - context.firstColumn) * context.axis.scale,
-                       context.height);
-    painter.fillRect(cells, context.palette->color(QPalette::Button));
-}

@@ -1,5 +1,5 @@
 #pragma once
-// The rows of a row control. Every row spans the control's width and is drawn in three parts:
+// The rows of a row control: text rows, the ruler and separators. Every row spans the control's width and is drawn in three parts:
 // its name in the name area, its position number in the number area and its cells in the
 // sequence area. Rows are plain objects owned by the control (not widgets), so that a pane of
 // thousands of rows costs what its visible rows cost.
@@ -95,14 +95,5 @@ class CSepWnd : public CScrollWnd {
     bool IsPrintable() const override { return false; }
     bool ShowsName() const override { return false; }
     // The line runs from the row's left edge, names included, to one pixel before its end.
-    void PaintCells(QPainter& painter, const CRowPaintContext& context) const override;
-};
-
-// An empty filler painted in the scroll-bar colour. Not printed.
-class CBumperWnd : public CScrollWnd {
-  public:
-    CBumperWnd(QString name, int height);
-    bool IsPrintable() const override { return false; }
-    bool ShowsName() const override { return false; }
     void PaintCells(QPainter& painter, const CRowPaintContext& context) const override;
 };

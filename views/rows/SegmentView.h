@@ -30,7 +30,7 @@ class CSegmentView : public CTilxView {
     CSegmentWnd* MoleculeRow(const std::string& name) const;
 
     // The selected columns of every row, in row order.
-    std::vector<ALN_BSEL_ENTRY> SelectionEntries() const;
+    std::vector<ALN_BSEL_ENTRY> SelectionEntries() const override;
     // Replaces the selection by these entries (rows that are missing are skipped).
     void SetSelectionEntries(const std::vector<ALN_BSEL_ENTRY>& entries);
 

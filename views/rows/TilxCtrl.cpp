@@ -132,11 +132,6 @@ void CTilxCtrl::SetExtraColumns(int columns) {
     Relayout();
 }
 
-void CTilxCtrl::SetCursorMarker(int column) {
-    m_markerColumn = column;
-    viewport()->update();
-}
-
 int CTilxCtrl::WidestNameWidth() const {
     const QFontMetrics metrics(m_nameFont);
     int widest = 0;
@@ -353,11 +348,6 @@ void CTilxCtrl::paintEvent(QPaintEvent*) {
         frame.selected = p.row->IsSelected();
         frame.current = p.index >= 0 && p.index == m_currentRow && hasFocus();
         PaintRow(painter, *p.row, frame);
-    }
-    if (m_markerColumn >= m_firstColumn && m_markerColumn < frame.endColumn) {
-        const int x = static_cast<int>(ColumnLeft(frame.axis, m_markerColumn));
-        painter.setPen(palette().color(QPalette::Text));
-        painter.drawLine(x, 0, x, viewport()->height());
     }
     PaintSelections(painter);
     PaintBand(painter);

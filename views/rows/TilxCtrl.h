@@ -62,8 +62,6 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
     // Columns added to the column count for the number area's width.
     void SetExtraColumns(int columns);
     const QFont& NameFont() const { return m_nameFont; }
-    void SetCursorMarker(int column);
-    int MarkerColumn() const { return m_markerColumn; }
 
     // Geometry, recomputed by Relayout() and on every size change.
     void Relayout();
@@ -191,7 +189,6 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
     QRect m_sequenceArea;
     std::vector<Placement> m_placements;
     int m_currentRow = -1;
-    int m_markerColumn = -1;
     TooltipProvider m_tooltip;
 
     // The gesture in progress.
