@@ -138,7 +138,8 @@ class CBlockProject : public CSerializable {
 
     // Files.
     //
-    // The project file's bytes and its atomic save (throws CFileException).
+    // The project file's bytes and its atomic save. Throws CFileException, also when the bytes
+    // would not read back, so that a file is never replaced by a project that cannot be opened.
     std::vector<std::uint8_t> ToBytes() const;
     void Save(const std::string& path) const;
     // Reads a project file into a new project; null when the data is not a block project.
@@ -151,9 +152,9 @@ class CBlockProject : public CSerializable {
     // reported through `prompt` and leaves the project as it was.
     OpenResult Open(const std::string& path, IUserPrompt& prompt);
 
-    // Parameters, molecule list, block set and links. A loaded project is checked (links and
-    // blocks must refer to its molecule entries and residues) and its history holds the loaded
-    // links only.
+    // Parameters, molecule list, block set and links. A loaded project is checked for all that
+    // later commands rely on (unique molecule names and keys, blocks and links within the
+    // residues of the molecules they name) and its history holds the loaded links only.
     void Serialize(CArchive& ar) override;
 
     static std::string ImportExceptionMessage();

@@ -1,32 +1,110 @@
 // Reading and writing block project files.
 
+#include <map>
+#include <set>
+
 #include "BlockProject.h"
 #include "archive/FileIO.h"
 
 namespace {
 
-// Blocks and links of a loaded project must name its molecule entries and stay within the
-// entries' residues (block layouts only within bounds that keep sums from overflowing).
-void CheckBlock(const CSimBlock& block, int entryCount) {
-    constexpr int kMax = CLink::kMaxValue;
-    for (int layout : {CSimBlock::kOriginal, CSimBlock::kCurrent}) {
-        const auto which = static_cast<CSimBlock::Layout>(layout);
-        bool bad = block.Width(which) < 0 || block.Width(which) > kMax;
-        for (int i = 0; i < block.MemberCount() && !bad; ++i) {
-            bad = block.Member(i) < 0 || block.Member(i) >= entryCount ||
-                  block.Start(which, i) < 0 || block.Start(which, i) > kMax;
-        }
-        if (bad)
-            throw CArchiveException(CArchiveException::genericError, "block out of range");
+[[noreturn]] void Refuse(const std::string& why) {
+    throw CArchiveException(CArchiveException::genericError, why);
+}
+
+std::string Quoted(const std::string& name) {
+    return "\"" + name + "\"";
+}
+
+// Names find a molecule's rows (panes, --rows, MSF) and keys find its block entry, so both
+// must be unique; a nameless molecule could be neither shown nor named.
+void CheckMolecules(const CMolList& molecules) {
+    std::set<std::string> names;
+    std::set<std::string> keys;
+    for (int i = 0; i < molecules.Count(); ++i) {
+        const CSxMolX& molecule = *molecules.At(i);
+        if (molecule.Name().empty())
+            Refuse("molecule " + std::to_string(i + 1) + " has no name");
+        if (!names.insert(molecule.Name()).second)
+            Refuse("two molecules are named " + Quoted(molecule.Name()));
+        if (!keys.insert(molecule.Key()).second)
+            Refuse("two molecules share the key " + molecule.Key());
     }
 }
 
-void CheckLink(const CLink& link, const CSimBlockSet& blockSet) {
+// What blocks and links may refer to in a molecule entry of the block set.
+struct CEntryExtent {
+    std::string name;
+    long long residues = 0;
+    bool shown = false;  // a molecule of the project shows the entry as a row
+};
+
+// Entries name distinct molecules; one that names a molecule of the project has its residues,
+// since the alignment lays out the molecule's sequence where blocks and links point.
+std::vector<CEntryExtent> CheckEntries(const CSimBlockSet& blockSet, const CMolList& molecules) {
+    std::map<std::string, const CSxMolX*> byKey;
+    for (int i = 0; i < molecules.Count(); ++i)
+        byKey.emplace(molecules.At(i)->Key(), molecules.At(i));
+    std::set<std::string> keys;
+    std::vector<CEntryExtent> extents;
+    for (const auto& entry : blockSet.Molecules().items) {
+        if (!keys.insert(entry->Key()).second)
+            Refuse("two block entries name the molecule " + Quoted(entry->Name()));
+        const auto molecule = byKey.find(entry->Key());
+        const bool shown = molecule != byKey.end();
+        if (shown && molecule->second->Sequence().size() != entry->Sequence().size()) {
+            Refuse("the block entry of " + Quoted(molecule->second->Name()) +
+                   " differs in length from the molecule");
+        }
+        extents.push_back({entry->Name(), static_cast<long long>(entry->Sequence().size()), shown});
+    }
+    return extents;
+}
+
+// Each layout of a block has a width and places every member it holds within the member's
+// residues; members are distinct entries. Values stay within bounds that keep sums from
+// overflowing, even for members the current layout leaves out.
+void CheckBlock(const CSimBlock& block, int index, const std::vector<CEntryExtent>& entries) {
+    constexpr int kMax = CLink::kMaxValue;
+    const std::string which = "block " + std::to_string(index + 1);
+    if (block.MemberCount() == 0)
+        Refuse(which + " has no members");
+    std::set<int> members;
+    for (int i = 0; i < block.MemberCount(); ++i) {
+        const int member = block.Member(i);
+        if (member < 0 || member >= static_cast<int>(entries.size()))
+            Refuse(which + " names a molecule entry the project does not hold");
+        if (!members.insert(member).second)
+            Refuse(which + " holds " + Quoted(entries[member].name) + " twice");
+    }
+    for (const CSimBlock::Layout layout : {CSimBlock::kOriginal, CSimBlock::kCurrent}) {
+        const int width = block.Width(layout);
+        if (width < 1 || width > kMax)
+            Refuse(which + " has a width of " + std::to_string(width));
+        for (int i = 0; i < block.MemberCount(); ++i) {
+            const int start = block.Start(layout, i);
+            if (start < 0 || start > kMax)
+                Refuse(which + " starts at " + std::to_string(start));
+            const CEntryExtent& entry = entries[block.Member(i)];
+            if (block.InLayout(layout, i) && start + width > entry.residues) {
+                Refuse(which + " reaches past the end of " + Quoted(entry.name) + " (" +
+                       std::to_string(entry.residues) + " residues)");
+            }
+        }
+    }
+}
+
+// A link places stretches of shown molecules, each within the molecule's residues.
+void CheckLink(const CLink& link, int index, const std::vector<CEntryExtent>& entries) {
+    const std::string which = "link " + std::to_string(index + 1);
     for (int k = 0; k < link.MoleculeCount(); ++k) {
-        const CSxMolEntry* entry = blockSet.MoleculeAt(link.Molecule(k));
-        if (!entry ||
-            link.Position(k) + link.Length(k) > static_cast<long long>(entry->Sequence().size())) {
-            throw CArchiveException(CArchiveException::genericError, "link out of range");
+        const int molecule = link.Molecule(k);
+        if (molecule >= static_cast<int>(entries.size()) || !entries[molecule].shown)
+            Refuse(which + " names a molecule the project does not hold");
+        const CEntryExtent& entry = entries[molecule];
+        if (static_cast<long long>(link.Position(k)) + link.Length(k) > entry.residues) {
+            Refuse(which + " reaches past the end of " + Quoted(entry.name) + " (" +
+                   std::to_string(entry.residues) + " residues)");
         }
     }
 }
@@ -47,11 +125,12 @@ void CBlockProject::Serialize(CArchive& ar) {
 }
 
 void CBlockProject::CheckLoaded() const {
-    for (int b = 0; b < m_blockSet.BlockCount(); ++b) {
-        CheckBlock(*m_blockSet.BlockAt(b), m_blockSet.MoleculeCount());
-    }
-    for (const auto& link : m_links)
-        CheckLink(*link, m_blockSet);
+    CheckMolecules(*m_molecules);
+    const std::vector<CEntryExtent> entries = CheckEntries(m_blockSet, *m_molecules);
+    for (int b = 0; b < m_blockSet.BlockCount(); ++b)
+        CheckBlock(*m_blockSet.BlockAt(b), b, entries);
+    for (int l = 0; l < m_links.Count(); ++l)
+        CheckLink(m_links.At(l), l, entries);
 }
 
 std::vector<std::uint8_t> CBlockProject::ToBytes() const {
@@ -72,7 +151,14 @@ std::vector<std::uint8_t> CBlockProject::ToBytes() const {
 }
 
 void CBlockProject::Save(const std::string& path) const {
-    WriteFileAtomically(path, ToBytes());
+    const std::vector<std::uint8_t> bytes = ToBytes();
+    // A file is replaced only by a project that reads back.
+    try {
+        FromBytes(bytes);
+    } catch (const CArchiveException& e) {
+        throw CFileException(path, std::string("the project would not read back: ") + e.what());
+    }
+    WriteFileAtomically(path, bytes);
 }
 
 bool CBlockProject::IsBlockProjectData(std::span<const std::uint8_t> bytes) {
@@ -97,7 +183,8 @@ CBlockProject::OpenResult CBlockProject::Open(const std::string& path, IUserProm
     } catch (const CFileException&) {
         prompt.ShowMessage("Error opening '" + path + "' file", MessageIcon::error);
     } catch (const CArchiveException& e) {
-        prompt.ShowMessage(e.Report(FileNameOf(path)), MessageIcon::error);
+        // The cause, then what exactly was wrong.
+        prompt.ShowMessage(FileNameOf(path) + "\n" + e.what(), MessageIcon::error);
     }
     return kOpenFailed;
 }

@@ -1,5 +1,6 @@
 #include "QuilterParams.h"
 
+#include <cmath>
 #include <filesystem>
 #include <memory>
 
@@ -41,6 +42,10 @@ std::uint32_t CQuilterParams::BlockColour(int index) const {
     return m_palette[((index % size) + size) % size];
 }
 
+bool CQuilterParams::IsValidExpectationLimit(double limit) {
+    return std::isfinite(limit) && limit > 0;
+}
+
 std::string CQuilterParams::NotTemplateMessage(const std::string& path) {
     return "File '" + path + "' is not a quilter template";
 }
@@ -53,26 +58,49 @@ std::string CQuilterParams::TemplateFormatErrorMessage(const std::string& path) 
     return "Error loading alignment template '" + path + "'";
 }
 
-bool CQuilterParams::LoadTemplate(const std::string& path, IUserPrompt* prompt) {
-    std::string failure;
+CQuilterParams::TemplateOutcome CQuilterParams::ReadTemplateFile(const std::string& path) {
     std::error_code error;
-    if (!std::filesystem::exists(path, error)) {
-        failure = TemplateFileErrorMessage(path);
-    } else {
-        try {
-            if (!ReadTemplateBytes(ReadWholeFile(path, kMaxTemplateBytes)) && prompt) {
-                prompt->ShowMessage(NotTemplateMessage(path), MessageIcon::exclamation);
-            }
-            SetCutoffFromMatrix();
-            return true;
-        } catch (const CFileException&) {
-            failure = TemplateFileErrorMessage(path);
-        } catch (const CArchiveException&) {
-            failure = TemplateFormatErrorMessage(path);
-        }
+    if (!std::filesystem::exists(path, error))
+        return kTemplateUnreadable;
+    try {
+        if (!ReadTemplateBytes(ReadWholeFile(path, kMaxTemplateBytes)))
+            return kNotTemplate;
+        SetCutoffFromMatrix();
+        return kTemplateRead;
+    } catch (const CFileException&) {
+        return kTemplateUnreadable;
+    } catch (const CArchiveException&) {
+        return kTemplateDamaged;
+    }
+}
+
+std::string CQuilterParams::TemplateOutcomeMessage(TemplateOutcome outcome,
+                                                   const std::string& path) {
+    switch (outcome) {
+        case kNotTemplate:
+            return NotTemplateMessage(path);
+        case kTemplateUnreadable:
+            return TemplateFileErrorMessage(path);
+        case kTemplateDamaged:
+            return TemplateFormatErrorMessage(path);
+        default:
+            return "";
+    }
+}
+
+bool CQuilterParams::LoadTemplate(const std::string& path, IUserPrompt* prompt) {
+    const TemplateOutcome outcome = ReadTemplateFile(path);
+    if (outcome == kTemplateRead)
+        return true;
+    const std::string message = TemplateOutcomeMessage(outcome, path);
+    if (outcome == kNotTemplate) {
+        if (prompt)
+            prompt->ShowMessage(message, MessageIcon::exclamation);
+        SetCutoffFromMatrix();
+        return true;
     }
     if (prompt) {
-        prompt->ShowMessage(failure, MessageIcon::exclamation);
+        prompt->ShowMessage(message, MessageIcon::exclamation);
     } else {
         SetDefaults();
     }
@@ -101,8 +129,9 @@ bool CQuilterParams::SaveTemplate(const std::string& path, IUserPrompt& prompt) 
     try {
         WriteFileAtomically(path, TemplateBytes());
         return true;
-    } catch (const CFileException&) {
-        prompt.ShowMessage(TemplateFileErrorMessage(path), MessageIcon::exclamation);
+    } catch (const CFileException& e) {
+        prompt.ShowMessage(TemplateFileErrorMessage(path) + "\n" + e.Reason(),
+                           MessageIcon::exclamation);
         return false;
     }
 }
@@ -117,9 +146,10 @@ void CQuilterParams::Serialize(CArchive& ar) {
     if (!ar.XDataContained(m_matrix) || (ar.IsLoading() && !m_matrix.IsValid())) {
         m_matrix = CScoreMatrix::Default();
     }
-    if (ar.IsLoading() && (m_cutoff < kMinCutoff || m_minSequences < kMinMinSequences)) {
+    if (ar.IsLoading() && (m_cutoff < kMinCutoff || m_minSequences < kMinMinSequences ||
+                           !IsValidExpectationLimit(m_expectationLimit))) {
         throw CArchiveException(CArchiveException::genericError,
-                                "search values below their limits");
+                                "search values outside their limits");
     }
 }
 

@@ -50,6 +50,14 @@ class CQuilterParams : public CSerializable {
     // Block `index` takes palette entry index modulo the palette size.
     std::uint32_t BlockColour(int index) const;
 
+    // What reading a template file came to.
+    enum TemplateOutcome { kTemplateRead, kNotTemplate, kTemplateUnreadable, kTemplateDamaged };
+    // Takes the parameters of a template file, the cutoff then being the matrix's default
+    // cutoff; any other outcome leaves the parameters as they were.
+    TemplateOutcome ReadTemplateFile(const std::string& path);
+    // The message of an outcome other than kTemplateRead.
+    static std::string TemplateOutcomeMessage(TemplateOutcome outcome, const std::string& path);
+
     // Loads a template file. With a prompt (interactive) every failure is reported through it
     // and leaves the parameters as they were; without one (the user's default template) failures
     // are silent and give the defaults. A file of another kind is reported and keeps the
@@ -59,10 +67,14 @@ class CQuilterParams : public CSerializable {
     // Takes the parameters of a template file's bytes; false, with nothing changed, when the
     // bytes are not a template. Throws CArchiveException for a damaged one.
     bool ReadTemplateBytes(std::span<const std::uint8_t> bytes);
-    // Writes a template file, replacing it atomically; a failure is reported through `prompt`.
+    // Writes a template file, replacing it atomically; a failure is reported through `prompt`
+    // with the system's reason on a second line.
     bool SaveTemplate(const std::string& path, IUserPrompt& prompt) const;
     // The bytes of a template file holding these parameters.
     std::vector<std::uint8_t> TemplateBytes() const;
+
+    // An expectation value limit is a positive, finite number.
+    static bool IsValidExpectationLimit(double limit);
 
     static std::string NotTemplateMessage(const std::string& path);
     static std::string TemplateFileErrorMessage(const std::string& path);
@@ -70,7 +82,8 @@ class CQuilterParams : public CSerializable {
 
     // Cutoff, minimum, expectation limit, text colour, linked text colour, palette, matrix. A
     // matrix that cannot be read is replaced by the built-in default; values below the lower
-    // limits of the cutoff and minimum are a format error.
+    // limits of the cutoff and minimum, or an expectation limit that is not a positive number,
+    // are a format error.
     void Serialize(CArchive& ar) override;
 
   private:

@@ -118,52 +118,6 @@ TEST_F(ProjectFileTest, CorruptedBytesNeverHalfReplaceTheProject) {
     EXPECT_EQ(current.ToBytes(), before);
 }
 
-// Writes a project record whose links are given separately, as a damaged file could hold them.
-class CRawProject : public CSerializable {
-  public:
-    CRawProject(const CBlockProject& source, CLinkList links)
-        : m_params(source.Params()),
-          m_molecules(std::make_unique<CMolList>(source.Molecules())),
-          m_blockSet(source.BlockSet()),
-          m_links(std::move(links)) {}
-    static constexpr const char* kClassTag = CBlockProject::kClassTag;
-    const char* ClassTag() const override { return kClassTag; }
-    void Serialize(CArchive& ar) override {
-        ar.XData(m_params);
-        ar.XPointer(m_molecules);
-        ar.XData(m_blockSet);
-        ar.XData(m_links);
-    }
-
-  private:
-    CQuilterParams m_params;
-    std::unique_ptr<CMolList> m_molecules;
-    CSimBlockSet m_blockSet;
-    CLinkList m_links;
-};
-
-std::vector<std::uint8_t> RawProjectBytes(const CBlockProject& source, int molecule, int position,
-                                          int length) {
-    CLinkList links;
-    auto link = std::make_unique<CLink>(position);
-    link->AddMolecule(0, position, length, 0);
-    link->AddMolecule(molecule, position, length, 0);
-    links.Add(std::move(link));
-    CArchive ar = CArchive::ForWriting();
-    std::string tag = CBlockProject::kFileTag;
-    ar.XMember(tag);
-    auto raw = std::make_unique<CRawProject>(source, std::move(links));
-    ar.XPointer(raw);
-    return ar.Bytes();
-}
-
-TEST_F(ProjectFileTest, LinksOutsideTheMoleculeEntriesAreAFormatError) {
-    EXPECT_TRUE(CBlockProject::FromBytes(RawProjectBytes(project, 2, 0, 13)));
-    EXPECT_THROW(CBlockProject::FromBytes(RawProjectBytes(project, 3, 0, 5)), CArchiveException);
-    // beta has 13 residues.
-    EXPECT_THROW(CBlockProject::FromBytes(RawProjectBytes(project, 1, 0, 14)), CArchiveException);
-}
-
 TEST(BroadcastRecord, RoundTripAndOwnRecordsAreIgnored) {
     const CBroadcastRecord sent{41, "MYG_HORSE", 2, 10, 20, 0};
     const std::vector<std::uint8_t> bytes = sent.ToBytes();

@@ -52,6 +52,16 @@ TEST(QuilterParams, TemplateLoadsBackWithTheMatrixDefaultCutoff) {
     EXPECT_EQ(loaded.Cutoff(), 48);  // 3 x 16, whatever was stored
 }
 
+TEST(QuilterParams, FailedSavesSayWhy) {
+    CScratchDir dir("tb_template");
+    CRecordingPrompt prompt;
+    const std::string missing = dir.File("absent/t.bp1");
+    EXPECT_FALSE(Customised().SaveTemplate(missing, prompt));
+    ASSERT_EQ(prompt.Messages().size(), 1u);
+    EXPECT_EQ(prompt.Messages()[0].text,
+              CQuilterParams::TemplateFileErrorMessage(missing) + "\nNo such file or directory");
+}
+
 TEST(QuilterParams, OtherFilesAreReportedOnlyWhenInteractive) {
     CScratchDir dir("tb_template");
     const std::string text = dir.Write("notes.txt", "just some text\n");
