@@ -111,12 +111,14 @@ CScoreMatrix LoadMatrix(const std::string& nameOrPath) {
 }
 
 // The parameters: defaults, then the template, then the explicit options.
-void ApplyParameters(const CSearchOptions& options, CQuilterParams& params, CCliContext& context) {
+void ApplyParameters(const CSearchOptions& options, CQuilterParams& params) {
     if (!options.templatePath.empty()) {
-        CSearchPrompt prompt(context.err, kTypeUnknown);
-        if (!params.LoadTemplate(options.templatePath, &prompt)) {
+        const CQuilterParams::TemplateOutcome outcome =
+            params.ReadTemplateFile(options.templatePath);
+        if (outcome != CQuilterParams::kTemplateRead) {
             throw CCliError(kCliBadInput,
-                            "tiler-blocks-cli: cannot use the template " + options.templatePath);
+                            "tiler-blocks-cli: " + CQuilterParams::TemplateOutcomeMessage(
+                                                       outcome, options.templatePath));
         }
     }
     if (!options.matrix.empty()) {
@@ -234,7 +236,7 @@ void RunSearch(const CSearchOptions& options, CCliContext& context) {
     // The defaults: the user's own template is read only when named.
     const auto owner = std::make_shared<CBlockProject>();
     CBlockProject& project = *owner;
-    ApplyParameters(options, project.Params(), context);
+    ApplyParameters(options, project.Params());
     AddFiles(options, project, context);
     const CSearchOutcome outcome = SearchAll(project, options, context);
     for (const std::string& message : outcome.messages)
@@ -269,8 +271,18 @@ void AddSearchCommand(CLI::App& app, CCliContext& context) {
     search
         ->add_option("--min-seqs", options->minSequences, "Minimum sequences per block (default 5)")
         ->check(CLI::Range(2, std::numeric_limits<int>::max()));
-    search->add_option("--evalue", options->expectationLimit,
-                       "Expectation value limit (default 0.0001)");
+    search
+        ->add_option("--evalue", options->expectationLimit,
+                     "Expectation value limit (default 0.0001)")
+        ->check(CLI::Validator(
+            [](const std::string& text) -> std::string {
+                double limit = 0;
+                return CLI::detail::lexical_cast(text, limit) &&
+                               CQuilterParams::IsValidExpectationLimit(limit)
+                           ? ""
+                           : "an expectation value limit is a positive number, not " + text;
+            },
+            "POSITIVE"));
     search->add_option("--template", options->templatePath, "Parameters from a template (.bp1)")
         ->check(CLI::ExistingFile);
     search->add_option("--raw", options->raw, "How to read unrecognised files")
