@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <limits>
 #include <new>
 
 #include "ScoreMatrix.h"
@@ -14,6 +15,7 @@
 #include "search/MemoryStatus.h"
 #include "search/OrderedWork.h"
 #include "search/PairScan.h"
+#include "search/PairScanKernel.h"
 
 namespace {
 
@@ -24,6 +26,22 @@ std::size_t BlockBytes(std::size_t members) {
            members * 4 * sizeof(std::int32_t);
 }
 
+// Figures of a few significant digits: "6.7 GB", "350 MB".
+std::string SizeText(std::uint64_t bytes) {
+    constexpr double kGb = 1 << 30;
+    constexpr double kMb = 1 << 20;
+    char text[32];
+    if (bytes >= kGb)
+        std::snprintf(text, sizeof text, "%.1f GB", bytes / kGb);
+    else
+        std::snprintf(text, sizeof text, "%.0f MB", std::max(1.0, bytes / kMb));
+    return text;
+}
+
+std::uint64_t RoundUpToProfile(std::uint64_t length) {
+    return (length + kProfileAlignment - 1) / kProfileAlignment * kProfileAlignment;
+}
+
 }  // namespace
 
 const char* const CSimTool::kLowMemoryMessage =
@@ -32,6 +50,35 @@ const char* const CSimTool::kTooManyDiagonalsMessage =
     "The molecules match each other at so many offsets that the search would find more "
     "diagonals and blocks than memory can hold.\nRaise the pairwise score cutoff, or search "
     "fewer closely related molecules.";
+
+const char* const CSimTool::kTooManyHitsMessage =
+    "The molecules match each other at so many offsets that the pairwise comparisons would find "
+    "more hits than the search can expand.\nRaise the pairwise score cutoff, or search fewer or "
+    "shorter molecules.";
+
+std::string CSimTool::NotEnoughMemoryMessage(std::uint64_t needed, std::uint64_t available) {
+    return "A search of these molecules needs about " + SizeText(needed) +
+           " of memory before it can compare them, and " + SizeText(available) +
+           " is available.\nSearch fewer or shorter molecules.";
+}
+
+std::uint64_t CSimTool::EstimateSearchBytes(const std::vector<std::size_t>& lengths,
+                                            int alphabetSize, bool profiles, int workers) {
+    std::uint64_t longest = 0;
+    std::uint64_t bytes = 0;
+    for (std::size_t length : lengths) {
+        longest = std::max<std::uint64_t>(longest, length);
+        bytes += length;  // the codes
+        if (profiles)
+            bytes += (alphabetSize + 1) * RoundUpToProfile(length) * sizeof(std::int16_t);
+        // the lists of hit offsets per pair (empty until hits are found)
+        bytes += lengths.size() * sizeof(std::vector<std::int32_t>);
+    }
+    bytes += lengths.size() * (2 * longest + 1) * sizeof(std::uint64_t);  // the hit masks
+    // Per worker, a running score per profile column and a mark per diagonal of a pair.
+    const std::uint64_t scratch = (RoundUpToProfile(longest) + 1) * sizeof(std::int16_t) + 2 * longest;
+    return bytes + static_cast<std::uint64_t>(std::max(workers, 1)) * scratch;
+}
 
 std::string CSimTool::TooManyMoleculesMessage(std::size_t count) {
     if (count <= kMaxMolecules)
@@ -75,6 +122,8 @@ int CSimTool::Run() {
     m_diagonals.clear();
     m_pairOffsets.clear();
     m_heldBytes = 0;
+    m_foundHits = 0;
+    m_stopReason = kNoFailure;
     SetStatusText("Initializing...");
     m_result->ClearBlocks();
     if (m_molecules.size() < 2)
@@ -84,12 +133,15 @@ int CSimTool::Run() {
         return Fail(kTooManyMolecules);
     }
     try {
+        if (!FitsInMemory())
+            return Fail(kNotEnoughMemory);
         if (!EncodeMolecules())
             return Fail(kUnencodableSequence);
         const CScoreGrid grid = GridOf(*m_matrix);
         CHitMasks masks(static_cast<int>(m_molecules.size()), LongestSequenceLength());
         bool cancelled = false;
-        ComparePairs(grid, masks, cancelled);
+        if (!ComparePairs(grid, masks, cancelled))
+            return Finish(0);
         if (!cancelled && !ExpandDiagonals(masks, cancelled))
             return Finish(0);
         if (!cancelled && !ScanDiagonals(grid, cancelled))
@@ -115,6 +167,20 @@ int CSimTool::Fail(Failure failure) {
     return Finish(0);
 }
 
+bool CSimTool::FitsInMemory() {
+    std::vector<std::size_t> lengths;
+    for (const CSimMol& molecule : m_molecules)
+        lengths.push_back(molecule.Sequence().size());
+    const bool profiles = CPairScanner::UsesProfiles(GridOf(*m_matrix), m_cutoff);
+    const std::uint64_t needed =
+        EstimateSearchBytes(lengths, m_matrix->Size(), profiles, WorkerCount(m_threadCount));
+    const std::uint64_t available = AvailableMemory();
+    if (needed <= available)
+        return true;
+    ShowMessage(NotEnoughMemoryMessage(needed, available));
+    return false;
+}
+
 bool CSimTool::EncodeMolecules() {
     for (std::size_t i = 0; i < m_molecules.size(); ++i) {
         std::vector<std::uint8_t> codes;
@@ -127,7 +193,7 @@ bool CSimTool::EncodeMolecules() {
     return true;
 }
 
-void CSimTool::ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& cancelled) {
+bool CSimTool::ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& cancelled) {
     const int count = static_cast<int>(m_molecules.size());
     std::vector<std::pair<int, int>> pairs;
     for (int i = 0; i < count; ++i) {
@@ -140,26 +206,42 @@ void CSimTool::ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& canc
     const CPairScanner scanner(grid, m_cutoff, EncodedSequences());
     m_pairOffsets.assign(count, std::vector<std::vector<std::int32_t>>(count));
 
-    using COffsets = std::vector<std::int32_t>;
-    const std::function<COffsets(std::size_t, int)> scan = [&](std::size_t k, int) {
-        COffsets offsets;
-        scanner.Scan(pairs[k].first, pairs[k].second, offsets);
-        return offsets;
+    struct CComparison {
+        std::vector<std::int32_t> offsets;
+        Failure stop = kNoFailure;
     };
-    const std::function<bool(std::size_t, COffsets&)> merge = [&](std::size_t k,
-                                                                  COffsets& offsets) {
+    const std::function<CComparison(std::size_t, int)> scan = [&](std::size_t k, int) {
+        CComparison comparison;
+        const std::function<bool()> shouldStop = StopCheck(comparison.stop);
+        std::size_t counted = 0;
+        const CScanProgress progress = [&](std::size_t hitsSoFar) {
+            m_foundHits += hitsSoFar - counted;
+            counted = hitsSoFar;
+            return !shouldStop();
+        };
+        scanner.Scan(pairs[k].first, pairs[k].second, comparison.offsets, progress);
+        return comparison;
+    };
+    bool stopped = false;
+    const std::function<bool(std::size_t, CComparison&)> merge = [&](std::size_t k,
+                                                                     CComparison& comparison) {
         const auto [i, j] = pairs[k];
         ReportProgress("Performing pairwise comparisons (%d of %d)", static_cast<int>(k) + 1,
                        total);
-        for (std::int32_t d : offsets) {
+        if (comparison.stop != kNoFailure) {
+            stopped = EndPhase(comparison.stop, cancelled);
+            return false;
+        }
+        for (std::int32_t d : comparison.offsets) {
             m_hits.push_back({i, j, d});
             masks.Add(i, j, d);
         }
-        m_pairOffsets[i][j] = std::move(offsets);
+        m_pairOffsets[i][j] = std::move(comparison.offsets);
         cancelled = StepProgress();
         return !cancelled;
     };
-    RunInOrder(WorkerCount(m_threadCount), pairs.size(), scan, merge);
+    RunPhase(pairs.size(), scan, merge);
+    return !stopped;
 }
 
 bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
@@ -170,31 +252,19 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
         workers, CDiagonalExpander(masks, m_pairOffsets, EffectiveMinSequences(), m_heldBytes));
     struct CExpansion {
         std::vector<CSimDiag> diagonals;
-        bool aborted = false;
-        bool outOfRoom = false;
+        Failure stop = kNoFailure;
     };
     const std::function<CExpansion(std::size_t, int)> expand = [&](std::size_t k, int worker) {
-        CDiagonalExpander& expander = expanders[worker];
         CExpansion expansion;
-        const std::function<bool()> shouldAbort = [&] {
-            if (IsCancelled())
-                return true;
-            expansion.outOfRoom = OutOfRoom();
-            return expansion.outOfRoom;
-        };
-        expansion.aborted = !expander.Expand(m_hits[k], shouldAbort, expansion.diagonals);
+        expanders[worker].Expand(m_hits[k], StopCheck(expansion.stop), expansion.diagonals);
         return expansion;
     };
     bool stopped = false;
     const std::function<bool(std::size_t, CExpansion&)> keep = [&](std::size_t k,
                                                                    CExpansion& expansion) {
         ReportProgress("Expanding diagonals (hit %d of %d)", static_cast<int>(k) + 1, total);
-        if (expansion.aborted) {
-            if (expansion.outOfRoom)
-                StopOutOfRoom();
-            else
-                m_failure = kCancelled;
-            stopped = true;
+        if (expansion.stop != kNoFailure) {
+            stopped = EndPhase(expansion.stop, cancelled);
             return false;
         }
         m_diagonals.insert(m_diagonals.end(), std::make_move_iterator(expansion.diagonals.begin()),
@@ -202,19 +272,53 @@ bool CSimTool::ExpandDiagonals(const CHitMasks& masks, bool& cancelled) {
         cancelled = StepProgress();
         return !cancelled;
     };
-    RunInOrder(workers, m_hits.size(), expand, keep);
+    RunPhase(m_hits.size(), expand, keep);
     return !stopped;
 }
 
-bool CSimTool::OutOfRoom() {
-    return m_heldBytes.load() > m_memoryBudget || IsMemoryLow();
+CSimTool::Failure CSimTool::OutOfRoom() {
+    if (m_foundHits.load() > m_hitLimit)
+        return kTooManyHits;
+    if (m_heldBytes.load() > m_memoryBudget)
+        return kTooManyDiagonals;
+    return IsMemoryLow() ? kLowMemory : kNoFailure;
 }
 
-void CSimTool::StopOutOfRoom() {
-    // What the search holds only grows, so the budget is still exceeded if it was.
-    const bool overBudget = m_heldBytes.load() > m_memoryBudget;
-    ShowMessage(overBudget ? kTooManyDiagonalsMessage : kLowMemoryMessage);
-    m_failure = overBudget ? kTooManyDiagonals : kLowMemory;
+std::function<bool()> CSimTool::StopCheck(Failure& reason) {
+    return [this, &reason] {
+        reason = m_stopReason.load();
+        if (reason == kNoFailure) {
+            reason = IsCancelled() ? kCancelled : OutOfRoom();
+            // The first reason seen stops every worker: memory that a stopped task gives back
+            // must not let the others go on.
+            Failure none = kNoFailure;
+            if (reason != kNoFailure && !m_stopReason.compare_exchange_strong(none, reason))
+                reason = none;
+        }
+        return reason != kNoFailure;
+    };
+}
+
+bool CSimTool::EndPhase(Failure reason, bool& cancelled) {
+    if (reason == kCancelled) {
+        cancelled = true;
+        return false;
+    }
+    const char* message = reason == kTooManyHits        ? kTooManyHitsMessage
+                          : reason == kTooManyDiagonals ? kTooManyDiagonalsMessage
+                                                        : kLowMemoryMessage;
+    ShowMessage(message);
+    m_failure = reason;
+    return true;
+}
+
+template <class Result>
+void CSimTool::RunPhase(std::size_t count, const std::function<Result(std::size_t, int)>& task,
+                        const std::function<bool(std::size_t, Result&)>& consume) {
+    const CThreadStarter start = [this](std::function<void()> work) {
+        return StartWorker(std::move(work));
+    };
+    RunInOrder(WorkerCount(m_threadCount), count, task, consume, start);
 }
 
 bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
@@ -222,40 +326,45 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
     BeginPhase("Scanning each diagonal for blocks...", 0, total, 1);
     const std::vector<const std::vector<std::uint8_t>*> sequences = EncodedSequences();
     const int longest = LongestSequenceLength();
-    const int workers = WorkerCount(m_threadCount);
-    CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets);
+    CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets, m_heldBytes);
     using CBlocks = std::vector<std::unique_ptr<CSimBlock>>;
-    // Blocks are built by the workers; identifiers are handed out here, in diagonal order.
-    const std::function<CBlocks(std::size_t, int)> scan = [&](std::size_t k, int) {
-        std::vector<CBlockCandidate> candidates;
-        ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins, candidates);
+    struct CScan {
         CBlocks made;
+        Failure stop = kNoFailure;
+    };
+    // Blocks are built by the workers; identifiers are handed out here, in diagonal order.
+    const std::function<CScan(std::size_t, int)> scan = [&](std::size_t k, int) {
+        CScan result;
+        std::vector<CBlockCandidate> candidates;
+        if (!ScanDiagonal(m_diagonals[k], longest, EffectiveMinSequences(), joins,
+                          StopCheck(result.stop), candidates))
+            return result;
         for (CBlockCandidate& candidate : candidates) {
-            made.push_back(std::make_unique<CSimBlock>(CSimBlock::CDeferredIdentifier{}));
-            made.back()->Init(std::move(candidate.molecules), std::move(candidate.starts),
-                              candidate.width, candidate.score, 0);
+            result.made.push_back(std::make_unique<CSimBlock>(CSimBlock::CDeferredIdentifier{}));
+            result.made.back()->Init(std::move(candidate.molecules), std::move(candidate.starts),
+                                     candidate.width, candidate.score, 0);
         }
-        return made;
+        return result;
     };
     CBlocks blocks;
     bool stopped = false;
-    const std::function<bool(std::size_t, CBlocks&)> make = [&](std::size_t k, CBlocks& made) {
+    const std::function<bool(std::size_t, CScan&)> make = [&](std::size_t k, CScan& result) {
         ReportProgress("Scanning each diagonal for blocks (diagonal %d of %d)",
                        static_cast<int>(k) + 1, total);
-        for (std::unique_ptr<CSimBlock>& block : made) {
+        for (std::unique_ptr<CSimBlock>& block : result.made) {
             block->TakeNewIdentifier();
             m_heldBytes += BlockBytes(block->MemberCount());
             blocks.push_back(std::move(block));
         }
-        if (OutOfRoom()) {
-            StopOutOfRoom();
-            stopped = true;
+        const Failure stop = result.stop != kNoFailure ? result.stop : OutOfRoom();
+        if (stop != kNoFailure) {
+            stopped = EndPhase(stop, cancelled);
             return false;
         }
         cancelled = StepProgress();
         return !cancelled;
     };
-    RunInOrder(workers, m_diagonals.size(), scan, make);
+    RunPhase(m_diagonals.size(), scan, make);
     if (stopped)
         return false;
     m_result->AddBlocksSorted(std::move(blocks));
@@ -284,6 +393,15 @@ void CSimTool::ShowMessage(const std::string&) {}
 
 bool CSimTool::IsMemoryLow() {
     return m_memoryWatch->IsLow();
+}
+
+std::uint64_t CSimTool::AvailableMemory() {
+    // Without the figures the search goes on: it cannot tell, and must not refuse to run.
+    return AvailableMemoryBytes().value_or(std::numeric_limits<std::uint64_t>::max());
+}
+
+std::thread CSimTool::StartWorker(std::function<void()> work) {
+    return StartThread(std::move(work));
 }
 
 std::string CSimTool::FormatText(const char* format, va_list args) {

@@ -8,8 +8,10 @@
 #include <atomic>
 #include <cstdarg>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "SimDiag.h"
@@ -29,11 +31,16 @@ class CSimTool {
     static constexpr int kMaxMolecules = 64;
     static const char* const kLowMemoryMessage;
     static const char* const kTooManyDiagonalsMessage;
+    static const char* const kTooManyHitsMessage;
     // How much the diagonals and blocks of one search may hold. Copies of one sequence that
     // resembles itself at other offsets can sit on either of two diagonals each, so their
     // maximal diagonals grow exponentially with their number; the budget stops such a search
     // early with its own message instead of when the whole system runs out.
     static constexpr std::size_t kDefaultMemoryBudget = std::size_t{128} << 20;
+    // How many hits one search may find. A cutoff that every run of a few residues reaches
+    // gives nearly every diagonal of every pair a hit, and long molecules have millions of
+    // diagonals; each hit holds about a hundred bytes through the search.
+    static constexpr std::size_t kDefaultHitLimit = std::size_t{1} << 21;
 
     // Why a run did not complete.
     enum Failure {
@@ -45,11 +52,20 @@ class CSimTool {
         kTooManyDiagonals,     // the diagonals and blocks outgrew the memory budget
         kOutOfMemory,          // an allocation failed
         kCancelled,
+        kTooManyHits,          // the pairwise comparisons found more hits than the hit limit
+        kNotEnoughMemory,      // the molecules need more memory than the system has (refused)
     };
 
     // The message for a selection of `count` molecules that one search cannot hold; empty when
     // the count is fine. Callers show it before starting a search.
     static std::string TooManyMoleculesMessage(std::size_t count);
+    // The message for a search refused because it needs `needed` bytes and `available` are left.
+    static std::string NotEnoughMemoryMessage(std::uint64_t needed, std::uint64_t available);
+    // The memory a search of molecules of these lengths allocates before it finds anything: the
+    // hit masks, the encoded sequences, the query profiles of the vectorised pair scan (when
+    // `profiles`, for an alphabet of `alphabetSize` letters) and each worker's scratch rows.
+    static std::uint64_t EstimateSearchBytes(const std::vector<std::size_t>& lengths,
+                                             int alphabetSize, bool profiles, int workers);
 
     // Copies the matrix and parameters, clears `result` and adds one entry per molecule, so that
     // molecule index i and entry index i name the same molecule.
@@ -62,9 +78,10 @@ class CSimTool {
     // Runs the three phases; returns what Finish() returned: 1 for a complete run, else 0.
     int Run();
 
-    // Worker threads of phase one; 0 (the default) uses every core.
+    // Worker threads of the phases; 0 (the default) uses every core.
     void SetThreadCount(int count) { m_threadCount = count; }
     void SetMemoryBudget(std::size_t bytes) { m_memoryBudget = bytes; }
+    void SetHitLimit(std::size_t hits) { m_hitLimit = hits; }
     // Asks a running search to stop after its current item; safe from any thread.
     void RequestCancel() { m_cancelRequested.store(true, std::memory_order_relaxed); }
 
@@ -96,22 +113,40 @@ class CSimTool {
     // Whether the system is low on memory; the base reads the system figures, at most a few
     // times a second. Called from the worker threads of the search too.
     virtual bool IsMemoryLow();
+    // The bytes this process can still allocate; the base reads the system figures (and the
+    // process's address-space limit). Asked once, before anything is allocated.
+    virtual std::uint64_t AvailableMemory();
+    // Starts a worker thread; throws std::system_error when the system refuses (the search then
+    // goes on with the workers it has, or on the calling thread alone).
+    virtual std::thread StartWorker(std::function<void()> work);
 
     static std::string FormatText(const char* format, va_list args);
 
   private:
+    // Refuses molecules that need more memory than the system has; false when refused.
+    bool FitsInMemory();
     bool EncodeMolecules();
     // The molecules' codes, in molecule order.
     std::vector<const std::vector<std::uint8_t>*> EncodedSequences() const;
     // The phases; false when the run must end at once (the failure is recorded).
-    void ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& cancelled);
+    bool ComparePairs(const CScoreGrid& grid, CHitMasks& masks, bool& cancelled);
     bool ExpandDiagonals(const CHitMasks& masks, bool& cancelled);
     bool ScanDiagonals(const CScoreGrid& grid, bool& cancelled);
     int Fail(Failure failure);
-    // Whether the search holds more than its budget or the system is low on memory.
-    bool OutOfRoom();
-    // Shows the message for the reason OutOfRoom() answered true and records the failure.
-    void StopOutOfRoom();
+    // Why the search cannot go on for lack of room: more hits than the limit, more diagonals and
+    // blocks than the budget, or a system low on memory; kNoFailure when there is room.
+    Failure OutOfRoom();
+    // A check for the workers' long tasks: true when the search is cancelled or out of room,
+    // and then `reason` says which.
+    std::function<bool()> StopCheck(Failure& reason);
+    // Ends a phase for `reason` (from StopCheck or OutOfRoom): a cancel is noted in
+    // `cancelled`; anything else shows its message and records the failure. Returns whether the
+    // run must end at once.
+    bool EndPhase(Failure reason, bool& cancelled);
+    // Runs a phase's tasks in order on the workers (see RunInOrder).
+    template <class Result>
+    void RunPhase(std::size_t count, const std::function<Result(std::size_t, int)>& task,
+                  const std::function<bool(std::size_t, Result&)>& consume);
     int EffectiveMinSequences() const;
 
     std::unique_ptr<CScoreMatrix> m_matrix;
@@ -125,7 +160,13 @@ class CSimTool {
     int m_failedMolecule = -1;
     std::unique_ptr<CMemoryWatch> m_memoryWatch;
     std::size_t m_memoryBudget = kDefaultMemoryBudget;
-    // Held by the kept diagonals and the blocks made so far; read by the workers.
+    std::size_t m_hitLimit = kDefaultHitLimit;
+    // Hits found by the workers of phase one so far, including those not yet merged.
+    std::atomic<std::size_t> m_foundHits{0};
+    // Why the workers were told to stop, once one of them was.
+    std::atomic<Failure> m_stopReason{kNoFailure};
+    // Held by the kept diagonals, the blocks made so far, the placement joins and the
+    // expansions' tables in use; read by the workers.
     std::atomic<std::size_t> m_heldBytes{0};
     std::vector<CSimHit> m_hits;
     std::vector<CSimDiag> m_diagonals;

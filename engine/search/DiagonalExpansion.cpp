@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <bit>
+#include <optional>
 
 namespace {
 
@@ -42,23 +43,41 @@ bool ComesBefore(const CSimDiag& a, const CSimDiag& b) {
 
 CDiagonalExpander::CDiagonalExpander(
     const CHitMasks& masks, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-    int minSequences, std::atomic<std::size_t>& foundBytes)
+    int minSequences, std::atomic<std::size_t>& heldBytes)
     : m_masks(masks),
       m_pairOffsets(pairOffsets),
       m_minSequences(minSequences),
-      m_foundBytes(foundBytes) {}
+      m_heldBytes(heldBytes) {}
 
 bool CDiagonalExpander::Expand(const CSimHit& hit, const std::function<bool()>& shouldAbort,
                                std::vector<CSimDiag>& kept) {
     m_hit = hit;
     m_shouldAbort = &shouldAbort;
     m_found.clear();
+    if (shouldAbort())
+        return false;
     CollectPlacements(hit);
-    if (m_candidateCount + 2 < m_minSequences || SomeExcludedJoinsEveryCandidate()) {
+    if (m_candidateCount + 2 < m_minSequences)
+        return true;
+    const std::optional<bool> dominated = SomeExcludedJoinsEveryCandidate();
+    if (!dominated)
+        return false;
+    if (*dominated) {
         // No diagonal of this hit can be kept; the search would only find that out slowly.
-        return !shouldAbort();
+        return true;
     }
-    BuildAdjacency();
+    // A family that matches everywhere gives a hit tens of thousands of placements, and the
+    // table grows with their square: the budget sees it before it is allocated, while it is used.
+    m_words = (m_placements.size() + 63) / 64;
+    const std::size_t tableBytes = m_placements.size() * m_words * sizeof(std::uint64_t);
+    m_heldBytes += tableBytes;
+    struct CRelease {
+        std::atomic<std::size_t>& heldBytes;
+        std::size_t bytes;
+        ~CRelease() { heldBytes -= bytes; }
+    } release{m_heldBytes, tableBytes};
+    if (shouldAbort() || !BuildAdjacency())
+        return false;
 
     CVertexSet candidates(m_words, 0);
     CVertexSet excluded(m_words, 0);
@@ -105,19 +124,24 @@ bool CDiagonalExpander::Joins(const CPlacement& a, const CPlacement& b) const {
            m_masks.Has(a.molecule, b.molecule, static_cast<long>(b.offset) - a.offset);
 }
 
-bool CDiagonalExpander::SomeExcludedJoinsEveryCandidate() const {
+std::optional<bool> CDiagonalExpander::SomeExcludedJoinsEveryCandidate() const {
     const auto candidates = m_placements.begin() + m_candidateCount;
-    return std::any_of(candidates, m_placements.end(), [&](const CPlacement& excluded) {
-        return std::all_of(m_placements.begin(), candidates,
-                           [&](const CPlacement& candidate) { return Joins(excluded, candidate); });
-    });
+    for (auto excluded = candidates; excluded != m_placements.end(); ++excluded) {
+        if ((*m_shouldAbort)())
+            return std::nullopt;
+        if (std::all_of(m_placements.begin(), candidates,
+                        [&](const CPlacement& candidate) { return Joins(*excluded, candidate); }))
+            return true;
+    }
+    return false;
 }
 
-void CDiagonalExpander::BuildAdjacency() {
+bool CDiagonalExpander::BuildAdjacency() {
     const std::size_t count = m_placements.size();
-    m_words = (count + 63) / 64;
     m_adjacency.assign(count * m_words, 0);
     for (std::size_t u = 0; u < count; ++u) {
+        if ((*m_shouldAbort)())
+            return false;
         for (std::size_t v = u + 1; v < count; ++v) {
             if (!Joins(m_placements[u], m_placements[v]))
                 continue;
@@ -125,6 +149,7 @@ void CDiagonalExpander::BuildAdjacency() {
             m_adjacency[v * m_words + u / 64] |= std::uint64_t{1} << (u % 64);
         }
     }
+    return true;
 }
 
 bool CDiagonalExpander::Search(std::vector<int>& clique, CVertexSet candidates,
@@ -195,6 +220,6 @@ void CDiagonalExpander::Report(const std::vector<int>& clique) {
     CSimDiag diagonal(m_hit);
     for (const CPlacement& placement : others)
         diagonal.Append(placement.molecule, placement.offset);
-    m_foundBytes += BytesOf(diagonal);
+    m_heldBytes += BytesOf(diagonal);
     m_found.push_back(std::move(diagonal));
 }

@@ -14,6 +14,7 @@
 #include <atomic>
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <vector>
 
 #include "SimDiag.h"
@@ -22,14 +23,16 @@
 class CDiagonalExpander {
   public:
     // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order. The
-    // approximate memory of every diagonal found is added to `foundBytes` (shared by the
-    // expanders of one search, so a budget can be watched while they run).
+    // approximate memory of every diagonal found is added to `heldBytes` (shared by the
+    // expanders of one search, so a budget can be watched while they run), and so is the
+    // expansion's own table while it is held.
     CDiagonalExpander(const CHitMasks& masks,
                       const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-                      int minSequences, std::atomic<std::size_t>& foundBytes);
+                      int minSequences, std::atomic<std::size_t>& heldBytes);
 
-    // Appends the diagonals of `hit` to `kept`. `shouldAbort` is asked at every step of the
-    // search; when it answers true nothing more is appended and the result is false.
+    // Appends the diagonals of `hit` to `kept`. `shouldAbort` is asked before the expansion
+    // allocates its table, while it fills it and at every step of the search; when it answers
+    // true nothing more is appended and the result is false.
     bool Expand(const CSimHit& hit, const std::function<bool()>& shouldAbort,
                 std::vector<CSimDiag>& kept);
     static std::size_t BytesOf(const CSimDiag& diagonal);
@@ -44,9 +47,10 @@ class CDiagonalExpander {
     void CollectPlacements(const CSimHit& hit);
     bool Joins(const CPlacement& a, const CPlacement& b) const;
     // An excluded placement that agrees with every candidate makes every diagonal of the hit
-    // extendable, so none is maximal.
-    bool SomeExcludedJoinsEveryCandidate() const;
-    void BuildAdjacency();
+    // extendable, so none is maximal. Nothing when told to abort.
+    std::optional<bool> SomeExcludedJoinsEveryCandidate() const;
+    // Fills the table of which placements join (m_words per placement); false when told to abort.
+    bool BuildAdjacency();
     bool Search(std::vector<int>& clique, CVertexSet candidates, CVertexSet excluded);
     int ChoosePivot(const CVertexSet& candidates, const CVertexSet& excluded) const;
     void Report(const std::vector<int>& clique);
@@ -63,5 +67,5 @@ class CDiagonalExpander {
     std::size_t m_words = 0;
     std::vector<std::uint64_t> m_adjacency;  // m_words per placement
     std::vector<CSimDiag> m_found;
-    std::atomic<std::size_t>& m_foundBytes;
+    std::atomic<std::size_t>& m_heldBytes;
 };

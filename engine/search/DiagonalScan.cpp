@@ -83,10 +83,13 @@ class CDiagonalScanner {
         m_pairScores.resize(diagonal.MemberCount() * diagonal.MemberCount());
     }
 
-    void CollectJoins() {
+    // False when `shouldAbort` answered true.
+    bool CollectJoins(const std::function<bool()>& shouldAbort) {
         const int count = m_diagonal.MemberCount();
         for (int a = 0; a < count; ++a) {
             for (int b = a + 1; b < count; ++b) {
+                if (shouldAbort())
+                    return false;
                 const int offset = m_diagonal.offsets[b] - m_diagonal.offsets[a];
                 const CPairJoin& join =
                     m_joins.Join(m_diagonal.members[a], m_diagonal.members[b], offset);
@@ -98,6 +101,7 @@ class CDiagonalScanner {
             }
         }
         SortEventsByColumn();
+        return true;
     }
 
     void Sweep(int minSequences, std::vector<CBlockCandidate>& blocks) {
@@ -249,8 +253,13 @@ CPairJoin JoinOf(const std::vector<std::uint8_t>& a, const std::vector<std::uint
 
 CPlacementJoins::CPlacementJoins(
     const std::vector<const std::vector<std::uint8_t>*>& sequences, const CScoreGrid& grid,
-    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets)
-    : m_sequences(sequences), m_grid(grid), m_cutoff(cutoff), m_count(pairOffsets.size()) {
+    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
+    std::atomic<std::size_t>& heldBytes)
+    : m_sequences(sequences),
+      m_grid(grid),
+      m_cutoff(cutoff),
+      m_count(pairOffsets.size()),
+      m_heldBytes(heldBytes) {
     for (std::size_t a = 0; a < m_count; ++a) {
         for (std::size_t b = 0; b < m_count; ++b) {
             m_firstOfPair.push_back(m_offsets.size());
@@ -280,6 +289,8 @@ const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) {
     std::uint8_t seen = state.load(std::memory_order_acquire);
     if (seen == kMissing && state.compare_exchange_strong(seen, kWorking)) {
         m_joins[index] = JoinOf(*m_sequences[a], *m_sequences[b], offset, m_grid, m_cutoff);
+        m_heldBytes += m_joins[index].prefix.capacity() * sizeof(std::int64_t) +
+                       m_joins[index].runs.capacity() * sizeof(CJoinedRun);
         state.store(kReady, std::memory_order_release);
         state.notify_all();
         return m_joins[index];
@@ -290,9 +301,11 @@ const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) {
     return m_joins[index];
 }
 
-void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,
-                  std::vector<CBlockCandidate>& blocks) {
+bool ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,
+                  const std::function<bool()>& shouldAbort, std::vector<CBlockCandidate>& blocks) {
     CDiagonalScanner scanner(diagonal, longest, joins);
-    scanner.CollectJoins();
+    if (!scanner.CollectJoins(shouldAbort))
+        return false;
     scanner.Sweep(minSequences, blocks);
+    return true;
 }

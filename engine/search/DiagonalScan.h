@@ -9,6 +9,7 @@
 
 #include <atomic>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <vector>
 
@@ -49,10 +50,12 @@ struct CPairJoin {
 class CPlacementJoins {
   public:
     // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order. The
-    // sequences and the grid must outlive this object.
+    // sequences and the grid must outlive this object. The approximate memory of each join
+    // worked out is added to `heldBytes`.
     CPlacementJoins(const std::vector<const std::vector<std::uint8_t>*>& sequences,
                     const CScoreGrid& grid, int cutoff,
-                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets);
+                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
+                    std::atomic<std::size_t>& heldBytes);
 
     // Molecules a < b with residue p of a facing residue p + offset of b, where offset is one of
     // their hit offsets (std::logic_error otherwise).
@@ -72,9 +75,11 @@ class CPlacementJoins {
     std::vector<std::int32_t> m_offsets;
     std::vector<CPairJoin> m_joins;
     std::unique_ptr<std::atomic<std::uint8_t>[]> m_states;
+    std::atomic<std::size_t>& m_heldBytes;
 };
 
 // Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the
-// longest molecule of the search; `minSequences` is at least 2.
-void ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,
-                  std::vector<CBlockCandidate>& blocks);
+// longest molecule of the search; `minSequences` is at least 2. `shouldAbort` is asked before
+// each member pair's join; when it answers true the result is false and `blocks` incomplete.
+bool ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,
+                  const std::function<bool()>& shouldAbort, std::vector<CBlockCandidate>& blocks);

@@ -19,6 +19,10 @@ std::optional<CMemoryFigures> ParseMemInfo(const std::string& text);
 // Less than a twentieth of all memory is still available.
 bool IsLowOnMemory(const CMemoryFigures& figures);
 
+// The bytes this process can still allocate: what the system has available, or less when the
+// process's address space is limited (ulimit -v); nothing when the system does not tell.
+std::optional<std::uint64_t> AvailableMemoryBytes();
+
 // The low-memory state, refreshed from the system at most every `interval`. Thread-safe without
 // a lock: the search asks at every step of every worker, and one caller at a time refreshes
 // while the others take the state last read.

@@ -8,8 +8,16 @@
 #include <exception>
 #include <functional>
 #include <memory>
+#include <system_error>
 #include <thread>
 #include <vector>
+
+// Starts a thread running `work`; throws (std::system_error) when the system refuses one.
+using CThreadStarter = std::function<std::thread(std::function<void()>)>;
+
+inline std::thread StartThread(std::function<void()> work) {
+    return std::thread(std::move(work));
+}
 
 // The number of worker threads to use for `requested` (0: one per core).
 inline int WorkerCount(int requested) {
@@ -25,17 +33,23 @@ inline int WorkerCount(int requested) {
 //
 // Workers take runs of consecutive tasks, a sixteenth of their share at a time: tasks of a few
 // microseconds would otherwise spend more time handing their results over than working.
+//
+// Workers are started with `start`; when the system refuses a thread, the work goes on with the
+// workers already started, or on this thread alone when it refused the first.
 template <class Result>
 bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::size_t, int)>& task,
-                const std::function<bool(std::size_t, Result&)>& consume) {
-    if (threads <= 1 || count <= 1) {
+                const std::function<bool(std::size_t, Result&)>& consume,
+                const CThreadStarter& start = StartThread) {
+    auto runHere = [&] {
         for (std::size_t i = 0; i < count; ++i) {
             Result result = task(i, 0);
             if (!consume(i, result))
                 return false;
         }
         return true;
-    }
+    };
+    if (threads <= 1 || count <= 1)
+        return runHere();
     const std::size_t run =
         std::max<std::size_t>(1, count / (static_cast<std::size_t>(threads) * 16));
     const std::size_t runs = (count + run - 1) / run;
@@ -65,9 +79,21 @@ bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::
         }
     };
     std::vector<std::thread> workers;
-    const int used = static_cast<int>(std::min<std::size_t>(threads, runs));
-    for (int t = 0; t < used; ++t)
-        workers.emplace_back(work, t);
+    const int wanted = static_cast<int>(std::min<std::size_t>(threads, runs));
+    workers.reserve(wanted);
+    try {
+        for (int t = 0; t < wanted; ++t)
+            workers.push_back(start([&work, t] { work(t); }));
+    } catch (const std::system_error&) {
+        // Refused by the system: the workers already started do the work.
+    } catch (...) {
+        stop.store(true);
+        for (auto& worker : workers)
+            worker.join();
+        throw;
+    }
+    if (workers.empty())
+        return runHere();
 
     bool completed = true;
     std::exception_ptr error;

@@ -3,6 +3,7 @@
 // running score (reset to 0 whenever it falls below 0) reaches the cutoff.
 
 #include <cstdint>
+#include <functional>
 #include <vector>
 
 #include "search/ScoreGrid.h"
@@ -13,6 +14,10 @@ std::vector<std::int32_t> ScanPairScalar(const std::vector<std::uint8_t>& a,
                                          const std::vector<std::uint8_t>& b, const CScoreGrid& grid,
                                          int cutoff);
 
+// Told how many hits a pair's scan has found so far, every few million residue pairs and once at
+// the end; answers false to stop the scan.
+using CScanProgress = std::function<bool(std::size_t hitsSoFar)>;
+
 // The same scan, vectorised across diagonals: each molecule gets a query profile (per residue
 // code, its scores against every position of the molecule as 16-bit values), and a row of the
 // other molecule is scored against many positions at once. Scores and cutoffs that do not fit
@@ -22,10 +27,20 @@ class CPairScanner {
     CPairScanner(const CScoreGrid& grid, int cutoff,
                  const std::vector<const std::vector<std::uint8_t>*>& sequences);
 
-    void Scan(int a, int b, std::vector<std::int32_t>& offsets) const;
+    // The hit offsets of molecules a and b, as ScanPairScalar gives them. False, with the offsets
+    // incomplete, when `progress` (if given) stopped the scan.
+    bool Scan(int a, int b, std::vector<std::int32_t>& offsets,
+              const CScanProgress& progress = {}) const;
     bool IsVectorised() const { return m_vectorised; }
+    // Whether a scanner for this grid and cutoff builds query profiles (is vectorised).
+    static bool UsesProfiles(const CScoreGrid& grid, int cutoff);
 
   private:
+    bool ScanScalar(int a, int b, std::vector<std::int32_t>& offsets,
+                    const CScanProgress& progress) const;
+    bool ScanVectorised(int a, int b, std::vector<std::int32_t>& offsets,
+                        const CScanProgress& progress) const;
+
     struct CProfile {
         std::size_t stride = 0;           // columns per code, padded to whole vectors
         std::vector<std::int16_t> cells;  // (grid size + 1) rows of `stride` columns

@@ -18,22 +18,20 @@ namespace tb_search {
 namespace HWY_NAMESPACE {
 namespace hn = hwy::HWY_NAMESPACE;
 
-// state[c + 1] is the running score of the diagonal through column c after the current row;
-// a diagonal that has reached the cutoff holds kHit, which stays at or above the cutoff
-// whatever is added (scores are bounded by kProfileScoreLimit).
-constexpr std::int16_t kHit = 0x7FFF;
-
 void ScanProfileRowsImpl(const std::int16_t* profile, std::size_t stride, const std::uint8_t* rows,
-                         std::size_t rowCount, std::size_t colCount, std::int16_t cutoff,
-                         std::int16_t* state, std::uint8_t* hitByDiagonal) {
+                         std::size_t firstRow, std::size_t endRow, std::size_t rowCount,
+                         std::size_t colCount, std::int16_t cutoff, std::int16_t* state,
+                         std::uint8_t* hitByDiagonal) {
     const hn::ScalableTag<std::int16_t> d;
     const std::size_t lanes = hn::Lanes(d);
     const auto zero = hn::Zero(d);
-    const auto hit = hn::Set(d, kHit);
+    const auto hit = hn::Set(d, kProfileHitState);
     const auto belowCutoff = hn::Set(d, static_cast<std::int16_t>(cutoff - 1));
-    for (std::size_t c = 0; c <= stride; ++c)
-        state[c] = 0;
-    for (std::size_t r = 0; r < rowCount; ++r) {
+    if (firstRow == 0) {
+        for (std::size_t c = 0; c <= stride; ++c)
+            state[c] = 0;
+    }
+    for (std::size_t r = firstRow; r < endRow; ++r) {
         const std::int16_t* scores = profile + rows[r] * stride;
         // Descending, so each vector reads the previous row's values before they are replaced.
         for (std::size_t c = stride; c >= lanes;) {
@@ -43,12 +41,14 @@ void ScanProfileRowsImpl(const std::int16_t* profile, std::size_t stride, const 
             hn::StoreU(hn::IfThenElse(hn::Gt(sum, belowCutoff), hit, kept), d, state + c + 1);
         }
         // The diagonal ending in the last column of this row.
-        if (state[colCount] == kHit)
+        if (state[colCount] == kProfileHitState)
             hitByDiagonal[colCount - 1 - r + rowCount - 1] = 1;
     }
+    if (endRow < rowCount)
+        return;
     // The diagonals ending in the last row.
     for (std::size_t c = 0; c < colCount; ++c) {
-        if (state[c + 1] == kHit)
+        if (state[c + 1] == kProfileHitState)
             hitByDiagonal[c] = 1;
     }
 }
@@ -79,10 +79,12 @@ CKernel ChooseKernel() {
 }  // namespace
 
 void ScanProfileRows(const std::int16_t* profile, std::size_t stride, const std::uint8_t* rows,
-                     std::size_t rowCount, std::size_t colCount, std::int16_t cutoff,
-                     std::int16_t* state, std::uint8_t* hitByDiagonal) {
+                     std::size_t firstRow, std::size_t endRow, std::size_t rowCount,
+                     std::size_t colCount, std::int16_t cutoff, std::int16_t* state,
+                     std::uint8_t* hitByDiagonal) {
     static const CKernel kernel = ChooseKernel();
-    kernel(profile, stride, rows, rowCount, colCount, cutoff, state, hitByDiagonal);
+    kernel(profile, stride, rows, firstRow, endRow, rowCount, colCount, cutoff, state,
+           hitByDiagonal);
 }
 #endif
 #endif  // TB_HAVE_HWY

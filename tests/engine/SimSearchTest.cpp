@@ -146,10 +146,12 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     // Every pair placed at offset 0.
     std::vector<std::vector<std::vector<std::int32_t>>> offsets(
         3, std::vector<std::vector<std::int32_t>>(3, std::vector<std::int32_t>{0}));
+    std::atomic<std::size_t> heldBytes{0};
+    const std::function<bool()> goOn = [] { return false; };
     for (int minimum : {2, 3}) {
-        CPlacementJoins joins(sequences, grid, 4, offsets);
+        CPlacementJoins joins(sequences, grid, 4, offsets, heldBytes);
         std::vector<CBlockCandidate> blocks;
-        ScanDiagonal(diagonal, 30, minimum, joins, blocks);
+        ASSERT_TRUE(ScanDiagonal(diagonal, 30, minimum, joins, goOn, blocks));
         ASSERT_EQ(blocks.size(), 1u) << minimum;
         EXPECT_EQ(blocks[0].molecules, (std::vector<std::int32_t>{0, 1, 2}));
         EXPECT_EQ(blocks[0].starts, (std::vector<std::int32_t>{11, 11, 11}));
@@ -160,11 +162,11 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     // Without the third member only the pair is joined: a block of two, or none with S = 3.
     const auto unrelated = Codes(std::string(30, 'X'));
     const std::vector<const std::vector<std::uint8_t>*> pairOnly{&first, &second, &unrelated};
-    CPlacementJoins joins(pairOnly, grid, 4, offsets);
+    CPlacementJoins joins(pairOnly, grid, 4, offsets, heldBytes);
     std::vector<CBlockCandidate> blocks;
-    ScanDiagonal(diagonal, 30, 3, joins, blocks);
+    ASSERT_TRUE(ScanDiagonal(diagonal, 30, 3, joins, goOn, blocks));
     EXPECT_TRUE(blocks.empty());
-    ScanDiagonal(diagonal, 30, 2, joins, blocks);
+    ASSERT_TRUE(ScanDiagonal(diagonal, 30, 2, joins, goOn, blocks));
     ASSERT_EQ(blocks.size(), 1u);
     EXPECT_EQ(blocks[0].molecules, (std::vector<std::int32_t>{0, 1}));
     EXPECT_EQ(blocks[0].starts, (std::vector<std::int32_t>{10, 10}));
