@@ -102,8 +102,9 @@ bool CBlockAlnView::ShowReceivedSelection(const CResidueSelection& selection) {
 
 const std::vector<int>& CBlockAlnView::ContextMenuCommands() {
     static const std::vector<int> commands = {
-        ID_DEFINE_BLOCK, 0, ID_LINK,         ID_UNLINK, 0, ID_BROADCAST_SELECTION, 0,
-        ID_COLOR_SETUP,  0, ID_FILE_PRINT_PREVIEW, ID_EDIT_CAMERA};
+        ID_DEFINE_BLOCK,        0, ID_LINK,        ID_UNLINK, 0,
+        ID_BROADCAST_SELECTION, 0, ID_COLOR_SETUP, 0,         ID_FILE_PRINT_PREVIEW,
+        ID_EDIT_CAMERA};
     return commands;
 }
 

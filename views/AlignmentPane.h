@@ -33,8 +33,7 @@ class CBlockAlnView : public CSegmentView, public ISelectionMirror {
     // The context menu built from the frame's actions (commands without one are left out).
     QMenu* CreateContextMenu(QWidget* parent) const;
 
-    void MirrorSelectionCompleted(const std::vector<ALN_BSEL_ENTRY>& entries,
-                                  bool scroll) override;
+    void MirrorSelectionCompleted(const std::vector<ALN_BSEL_ENTRY>& entries, bool scroll) override;
     void MirrorSelectionCleared() override;
     void MirrorRowRange(const std::string& row, int start, int end) override;
     void MirrorRowMoved(const std::string& row, int index) override;

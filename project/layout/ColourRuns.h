@@ -22,6 +22,6 @@ class CColourRuns {
     bool IsBoundary(int position) const;
 
   private:
-    std::vector<int> m_starts;              // sorted boundaries
-    std::vector<std::uint32_t> m_colours;   // colour of [m_starts[i], m_starts[i + 1])
+    std::vector<int> m_starts;             // sorted boundaries
+    std::vector<std::uint32_t> m_colours;  // colour of [m_starts[i], m_starts[i + 1])
 };

@@ -35,10 +35,9 @@ class AlnImageTest : public AlnPaneTest {
     // The background every cell should have: the colour of the block holding its residue, none
     // for residues outside blocks and for B's gap (the block on its right starts after it).
     QColor ExpectedBackground(int entry, int column, const QColor& none) {
-        static const int kResidueOf[3][14] = {
-            {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, -1, -1},
-            {0, 1, 2, 3, -1, -1, 4, 5, 6, 7, 8, 9, -1, -1},
-            {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13}};
+        static const int kResidueOf[3][14] = {{0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, -1, -1},
+                                              {0, 1, 2, 3, -1, -1, 4, 5, 6, 7, 8, 9, -1, -1},
+                                              {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13}};
         const int residue = kResidueOf[entry][column];
         const CSimBlock* block = residue < 0 ? nullptr : BlockWith(m_project, entry, residue);
         return block ? StoredColour(m_project.BlockColourById(block->Identifier()), none) : none;
@@ -66,13 +65,14 @@ class AlnImageTest : public AlnPaneTest {
 
     // Checks every cell of rows A, B, C painted with `axis`, rows at `tops`: `none` behind
     // residues outside blocks, `beyond` where a row has ended.
-    void CheckCells(const QImage& image, const CColumnAxis& axis, const int (&tops)[3],
-                    int height, const QColor& none, const QColor& beyond) {
+    void CheckCells(const QImage& image, const CColumnAxis& axis, const int (&tops)[3], int height,
+                    const QColor& none, const QColor& beyond) {
         for (int entry = 0; entry < 3; ++entry) {
             for (int column = 0; column < 14; ++column) {
                 const int left = static_cast<int>(std::ceil(ColumnLeft(axis, column)));
                 const int right = static_cast<int>(ColumnLeft(axis, column + 1)) - 1;
-                const QRect cell(QPoint(left, tops[entry]), QPoint(right, tops[entry] + height - 1));
+                const QRect cell(QPoint(left, tops[entry]),
+                                 QPoint(right, tops[entry] + height - 1));
                 const QColor expected =
                     entry < 2 && column >= 12 ? beyond : ExpectedBackground(entry, column, none);
                 EXPECT_EQ(image.pixelColor(cell.topLeft()), expected)

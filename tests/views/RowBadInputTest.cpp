@@ -23,8 +23,7 @@ void PaintAll(const IPrintableRows& rows) {
     const QSize size = rows.ContentSize(0, rows.ColumnCount(), 0, rows.PrintRowCount(), options);
     QImage image(size.boundedTo(QSize(4000, 4000)).expandedTo(QSize(1, 1)), QImage::Format_RGB32);
     QPainter painter(&image);
-    rows.PaintRange(painter, QPoint(0, 0), 0, rows.ColumnCount(), 0, rows.PrintRowCount(),
-                    options);
+    rows.PaintRange(painter, QPoint(0, 0), 0, rows.ColumnCount(), 0, rows.PrintRowCount(), options);
 }
 
 TEST(RowBadInput, PaneWithoutProjectIsEmpty) {
@@ -51,8 +50,8 @@ class RowExtremesTest : public ::testing::Test {
         const std::string longName(10 * 1024, 'n');
         m_ctrl.AddRow(std::make_unique<CSegmentWnd>(QStringLiteral("empty"), "", m_colours));
         m_ctrl.AddRow(std::make_unique<CSegmentWnd>(QStringLiteral("one"), "m", m_colours));
-        m_ctrl.AddRow(std::make_unique<CSegmentWnd>(QString::fromStdString(longName), "mkv",
-                                                    m_colours));
+        m_ctrl.AddRow(
+            std::make_unique<CSegmentWnd>(QString::fromStdString(longName), "mkv", m_colours));
         m_ctrl.AddRow(std::make_unique<CSegmentWnd>(QStringLiteral("huge"),
                                                     std::string(100000, 'a'), m_colours));
         m_ctrl.resize(400, 200);

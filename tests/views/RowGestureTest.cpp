@@ -1,7 +1,7 @@
 #include <QClipboard>
+#include <QMenu>
 #include <QMimeData>
 #include <QScrollBar>
-#include <QMenu>
 #include <QSignalSpy>
 #include <map>
 
@@ -228,13 +228,14 @@ TEST_F(AlnPaneTest, ContextMenuFollowsTheCommandOrder) {
         if (id != 0)
             actions[id] = new QAction(QString::number(id), &owner);
     }
-    m_pane.SetActionLookup([&actions](int id) { return actions.count(id) ? actions[id] : nullptr; });
+    m_pane.SetActionLookup(
+        [&actions](int id) { return actions.count(id) ? actions[id] : nullptr; });
     std::unique_ptr<QMenu> menu(m_pane.CreateContextMenu(nullptr));
     QStringList items;
     for (QAction* action : menu->actions())
         items << (action->isSeparator() ? QStringLiteral("-") : action->text());
-    const QStringList expected = {"32784", "-", "32786", "32787", "-", "32843", "-",
-                                  "32824", "-", "57609", "30417"};
+    const QStringList expected = {"32784", "-",     "32786", "32787", "-",    "32843",
+                                  "-",     "32824", "-",     "57609", "30417"};
     EXPECT_EQ(items, expected);
     m_pane.SetActionLookup(nullptr);
 }

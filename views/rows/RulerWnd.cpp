@@ -29,9 +29,9 @@ void CRulerWnd::PaintCells(QPainter& painter, const CRowPaintContext& context) c
     const int end = std::min(context.endColumn, m_columns);
     const double right = ColumnLeft(context.axis, std::max(end, context.firstColumn));
     const double bottom = context.top + context.height - 1;
-    painter.fillRect(QRectF(context.axis.areaLeft, context.top, right - context.axis.areaLeft,
-                            context.height),
-                     StoredColour(m_background, context.emptyBackground));
+    painter.fillRect(
+        QRectF(context.axis.areaLeft, context.top, right - context.axis.areaLeft, context.height),
+        StoredColour(m_background, context.emptyBackground));
     if (scale <= 0 || context.firstColumn >= end)
         return;
     painter.setFont(m_font);
@@ -50,16 +50,15 @@ void CRulerWnd::PaintCells(QPainter& painter, const CRowPaintContext& context) c
     }
     if (context.printing) {
         // On paper the stretch is numbered at its two ends.
-        PaintLabel(painter, context, context.axis.areaLeft, context.firstColumn + 1,
-                   Qt::AlignLeft);
+        PaintLabel(painter, context, context.axis.areaLeft, context.firstColumn + 1, Qt::AlignLeft);
         PaintLabel(painter, context, right, end, Qt::AlignRight);
     }
     painter.setPen(line);
     painter.drawLine(QPointF(context.axis.areaLeft, bottom), QPointF(right - 1, bottom));
 }
 
-void CRulerWnd::PaintLabel(QPainter& painter, const CRowPaintContext& context, double x,
-                           int number, Qt::Alignment side) const {
+void CRulerWnd::PaintLabel(QPainter& painter, const CRowPaintContext& context, double x, int number,
+                           Qt::Alignment side) const {
     const QString text = QString::number(number);
     const double width = QFontMetricsF(m_font).horizontalAdvance(text);
     const double left = side == Qt::AlignLeft    ? x

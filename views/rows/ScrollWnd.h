@@ -1,8 +1,8 @@
 #pragma once
-// The rows of a row control: text rows, the ruler and separators. Every row spans the control's width and is drawn in three parts:
-// its name in the name area, its position number in the number area and its cells in the
-// sequence area. Rows are plain objects owned by the control (not widgets), so that a pane of
-// thousands of rows costs what its visible rows cost.
+// The rows of a row control: text rows, the ruler and separators. Every row spans the control's
+// width and is drawn in three parts: its name in the name area, its position number in the number
+// area and its cells in the sequence area. Rows are plain objects owned by the control (not
+// widgets), so that a pane of thousands of rows costs what its visible rows cost.
 
 #include <QColor>
 #include <QFont>
@@ -70,7 +70,9 @@ class CScrollWnd {
 
     // The selected columns of this row; empty when none.
     CColumnRange Selection() const { return m_selection; }
-    void SetSelection(CColumnRange range) { m_selection = range.IsEmpty() ? CColumnRange{} : range; }
+    void SetSelection(CColumnRange range) {
+        m_selection = range.IsEmpty() ? CColumnRange{} : range;
+    }
     void ClearSelection() { m_selection = {}; }
     bool HasSelection() const { return !m_selection.IsEmpty(); }
     // The selected state the name area shows.

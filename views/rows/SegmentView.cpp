@@ -84,8 +84,8 @@ void CSegmentView::SetSelectionEntries(const std::vector<ALN_BSEL_ENTRY>& entrie
         ctrl->RowAt(i)->ClearSelection();
     for (const ALN_BSEL_ENTRY& entry : entries) {
         const int index = ctrl->IndexOfRow(QString::fromStdString(entry.name));
-        ctrl->SetRowSelection(index, {std::min(entry.start, entry.end),
-                                      std::max(entry.start, entry.end)});
+        ctrl->SetRowSelection(index,
+                              {std::min(entry.start, entry.end), std::max(entry.start, entry.end)});
     }
     ctrl->viewport()->update();
 }

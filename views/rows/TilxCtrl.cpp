@@ -145,8 +145,7 @@ int CTilxCtrl::WidestNameWidth() const {
 }
 
 int CTilxCtrl::NumberAreaWidth() const {
-    const QString sample =
-        QString::fromStdString(NumberAreaSample(m_columnCount, m_extraColumns));
+    const QString sample = QString::fromStdString(NumberAreaSample(m_columnCount, m_extraColumns));
     return QFontMetrics(m_nameFont).horizontalAdvance(sample) + 2;
 }
 
@@ -227,7 +226,8 @@ void CTilxCtrl::UpdatePlacements() {
     const int middleEnd = index + MiddleRowCount();
     for (int i = middleEnd; i < RowCount(); ++i)
         bottomHeight += m_rows[i]->RowHeight();
-    const int middleBottom = height - bottomHeight - (middleEnd < RowCount() ? m_sepBottom.RowHeight() : 0);
+    const int middleBottom =
+        height - bottomHeight - (middleEnd < RowCount() ? m_sepBottom.RowHeight() : 0);
     for (int i = index + m_firstRow; i < middleEnd && y < middleBottom; ++i) {
         m_placements.push_back({m_rows[i].get(), i, y, m_rows[i]->RowHeight()});
         y += m_rows[i]->RowHeight();
@@ -362,8 +362,8 @@ void CTilxCtrl::PaintRow(QPainter& painter, const CScrollWnd& row, const RowFram
     const double cellsWidth = (frame.endColumn - frame.axis.firstColumn) * frame.axis.scale;
     // A separator line also crosses the names.
     const double clipLeft = row.ShowsName() || row.IsPrintable() ? frame.axis.areaLeft : 0;
-    painter.setClipRect(QRectF(clipLeft, frame.top, frame.axis.areaLeft - clipLeft + cellsWidth,
-                               frame.height));
+    painter.setClipRect(
+        QRectF(clipLeft, frame.top, frame.axis.areaLeft - clipLeft + cellsWidth, frame.height));
     CRowPaintContext context;
     context.axis = frame.axis;
     context.firstColumn = frame.axis.firstColumn;
@@ -383,14 +383,17 @@ void CTilxCtrl::PaintName(QPainter& painter, const CScrollWnd& row, const RowFra
         return;
     const QRect area(0, frame.top, frame.nameWidth, frame.height);
     const bool highlighted = frame.selected && !frame.printing;
-    painter.fillRect(area, highlighted ? palette().color(QPalette::Highlight) : frame.emptyBackground);
+    painter.fillRect(area,
+                     highlighted ? palette().color(QPalette::Highlight) : frame.emptyBackground);
     painter.setPen(palette().color(highlighted ? QPalette::HighlightedText : QPalette::Text));
     painter.setFont(m_nameFont);
     const QFontMetrics metrics(m_nameFont);
     const std::string shortened = ShortenName(row.Name().toStdString(), m_maxNameLength);
-    const std::string shown = ElideName(shortened, frame.nameWidth - 5, [&metrics](std::string_view text) {
-        return metrics.horizontalAdvance(QString::fromUtf8(text.data(), static_cast<int>(text.size())));
-    });
+    const std::string shown =
+        ElideName(shortened, frame.nameWidth - 5, [&metrics](std::string_view text) {
+            return metrics.horizontalAdvance(
+                QString::fromUtf8(text.data(), static_cast<int>(text.size())));
+        });
     painter.setClipRect(area);
     painter.drawText(area.adjusted(2, 0, 0, 0), Qt::AlignLeft | Qt::AlignVCenter,
                      QString::fromStdString(shown));
@@ -436,7 +439,9 @@ void CTilxCtrl::PaintBand(QPainter& painter) const {
     if (m_drag != Drag::kBand)
         return;
     const std::optional<QRect> start = RowRect(m_anchorRow);
-    const int startY = start ? start->top() : (m_anchorRow < FirstMiddleIndex() + m_firstRow ? 0 : viewport()->height());
+    const int startY =
+        start ? start->top()
+              : (m_anchorRow < FirstMiddleIndex() + m_firstRow ? 0 : viewport()->height());
     const double startX = ColumnLeft(Axis(), 0) + m_bandStart * m_scale;
     const QPoint end(std::clamp(m_lastPosition.x(), m_sequenceArea.left(), m_sequenceArea.right()),
                      std::clamp(m_lastPosition.y(), 0, viewport()->height()));
@@ -619,7 +624,8 @@ void CTilxCtrl::mouseMoveEvent(QMouseEvent* event) {
     m_lastPosition = position;
     switch (m_drag) {
         case Drag::kName:
-            if ((position - m_pressPosition).manhattanLength() >= QApplication::startDragDistance()) {
+            if ((position - m_pressPosition).manhattanLength() >=
+                QApplication::startDragDistance()) {
                 m_nameDragged = true;
                 viewport()->setCursor(Qt::ClosedHandCursor);
             }
@@ -687,14 +693,15 @@ int CTilxCtrl::BandRowAtY(int y) const {
 }
 
 void CTilxCtrl::FinishBand(bool adding) {
-    const double end = ColumnCoordinate(Axis(), std::clamp(m_lastPosition.x(), m_sequenceArea.left(),
-                                                           m_sequenceArea.right()));
+    const double end = ColumnCoordinate(
+        Axis(), std::clamp(m_lastPosition.x(), m_sequenceArea.left(), m_sequenceArea.right()));
     const CColumnRange band = BandColumns(m_bandStart, end, m_columnCount);
     const int endRow = BandRowAtY(std::clamp(m_lastPosition.y(), 0, viewport()->height() - 1));
     // Per-row mode selects the rows the band meets; column mode every row.
-    const auto [firstRow, lastRow] = m_flags.perRowSelection && endRow >= 0
-                                         ? std::pair(std::min(m_anchorRow, endRow), std::max(m_anchorRow, endRow))
-                                         : std::pair(0, RowCount() - 1);
+    const auto [firstRow, lastRow] =
+        m_flags.perRowSelection && endRow >= 0
+            ? std::pair(std::min(m_anchorRow, endRow), std::max(m_anchorRow, endRow))
+            : std::pair(0, RowCount() - 1);
     for (int i = firstRow; i <= lastRow; ++i) {
         CScrollWnd* row = RowAt(i);
         if (!row || !row->IsSelectable())
@@ -731,8 +738,8 @@ void CTilxCtrl::AutoScrollTick() {
         m_autoScroll.stop();
         return;
     }
-    const int dx = OutsideDirection(m_lastPosition.x(), m_sequenceArea.left(),
-                                    m_sequenceArea.right() + 1);
+    const int dx =
+        OutsideDirection(m_lastPosition.x(), m_sequenceArea.left(), m_sequenceArea.right() + 1);
     // Middle rows scroll when the mouse is above the first or below the last shown one.
     int top = 0;
     int bottom = viewport()->height();
@@ -756,9 +763,9 @@ void CTilxCtrl::AutoScrollTick() {
 void CTilxCtrl::UpdateHoverCursor(QPoint position) {
     const int index = RowAtY(position.y());
     const CScrollWnd* row = RowAt(index);
-    const bool onEdge = row && m_flags.edgeDrag && row->IsSelectable() &&
-                        m_sequenceArea.contains(position) &&
-                        SelectionEdgeAt(Axis(), position.x(), row->Selection()) != SelectionEdge::kNone;
+    const bool onEdge =
+        row && m_flags.edgeDrag && row->IsSelectable() && m_sequenceArea.contains(position) &&
+        SelectionEdgeAt(Axis(), position.x(), row->Selection()) != SelectionEdge::kNone;
     if (onEdge)
         viewport()->setCursor(Qt::SizeHorCursor);
     else
@@ -775,8 +782,10 @@ bool CTilxCtrl::viewportEvent(QEvent* event) {
 
 void CTilxCtrl::ShowTooltip(QHelpEvent* event) {
     const int index = RowAtY(event->pos().y());
-    const int column = m_sequenceArea.contains(event->pos()) ? ColumnAtX(Axis(), event->pos().x()) : -1;
-    const QString text = m_flags.tooltips && m_tooltip && index >= 0 ? m_tooltip(index, column) : QString();
+    const int column =
+        m_sequenceArea.contains(event->pos()) ? ColumnAtX(Axis(), event->pos().x()) : -1;
+    const QString text =
+        m_flags.tooltips && m_tooltip && index >= 0 ? m_tooltip(index, column) : QString();
     if (text.isEmpty())
         QToolTip::hideText();
     else

@@ -5,8 +5,8 @@
 // display columns, vertical ones middle-row indices.
 
 #include <QAbstractScrollArea>
-#include <QHelpEvent>
 #include <QFont>
+#include <QHelpEvent>
 #include <QTimer>
 #include <functional>
 #include <memory>
@@ -20,16 +20,16 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
     Q_OBJECT
   public:
     struct Flags {
-        bool characterMode = true;       // scale from the rows' character cells
-        bool fitToWidth = false;         // scale so that all columns fit
+        bool characterMode = true;  // scale from the rows' character cells
+        bool fitToWidth = false;    // scale so that all columns fit
         bool showNames = true;
         bool showNumbers = true;
-        bool perRowSelection = true;     // each row keeps its own range
+        bool perRowSelection = true;  // each row keeps its own range
         bool mouseSelection = true;
         bool edgeDrag = true;
         bool noAutoScroll = false;
         bool tooltips = true;
-        bool clickTogglesName = false;   // every click on a name acts as a Ctrl-click
+        bool clickTogglesName = false;  // every click on a name acts as a Ctrl-click
         bool multipleSelectedRows = true;
     };
     // Where a row stands on the screen.
@@ -72,7 +72,9 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
     QRect NameArea() const { return m_nameArea; }
     QRect NumberArea() const { return m_numberArea; }
     QRect SequenceArea() const { return m_sequenceArea; }
-    CColumnAxis Axis() const { return {m_sequenceArea.left(), m_scale, m_firstColumn, m_columnCount}; }
+    CColumnAxis Axis() const {
+        return {m_sequenceArea.left(), m_scale, m_firstColumn, m_columnCount};
+    }
     const std::vector<Placement>& Placements() const { return m_placements; }
     // The rectangle of a row in the viewport, when the row is shown.
     std::optional<QRect> RowRect(int index) const;
@@ -107,8 +109,8 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
     double ColumnWidth(const CRowPrintOptions& options) const override;
     QSize ContentSize(int firstColumn, int endColumn, int firstRow, int endRow,
                       const CRowPrintOptions& options) const override;
-    void PaintRange(QPainter& painter, QPoint origin, int firstColumn, int endColumn,
-                    int firstRow, int endRow, const CRowPrintOptions& options) const override;
+    void PaintRange(QPainter& painter, QPoint origin, int firstColumn, int endColumn, int firstRow,
+                    int endRow, const CRowPrintOptions& options) const override;
 
   signals:
     void selectionCleared();
@@ -194,8 +196,8 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
     // The gesture in progress.
     Drag m_drag = Drag::kNone;
     int m_dragRow = -1;
-    double m_bandStart = 0;  // fractional column where the band began
-    int m_fixedBoundary = 0; // the column boundary that stays while an edge is dragged
+    double m_bandStart = 0;   // fractional column where the band began
+    int m_fixedBoundary = 0;  // the column boundary that stays while an edge is dragged
     int m_anchorColumn = -1;
     int m_anchorRow = -1;
     QPoint m_pressPosition;
