@@ -102,10 +102,9 @@ TEST(PageBands, MarginsThatLeaveNoRoomGiveNoPage) {
 }
 
 TEST(PrintPlan, StretchesShareAPageWhenTheyFit) {
-    // Body 170 x 237 mm. Names 26.5 mm + 0.5 mm gap leave 143 mm: 57 columns of 2.5 mm
-    // (57 x 2.5 = 142.5). 1000 columns make 18 stretches (17 x 57 = 969, the last has 31).
+    // Body 170 x 237 mm. Names of 27 mm leave 143 mm: 57 columns of 2.5 mm (57 x 2.5 = 142.5). 1000 columns make 18 stretches (17 x 57 = 969, the last has 31).
     // A stretch of 10 rows x 4 mm = 40 mm plus the 5 mm gap: 5 per page (225 mm), so 4 pages.
-    const CPrintPlan plan = PlanPrint(Rows(26.5, 2.5, 1000, 10, 4), 170, 237);
+    const CPrintPlan plan = PlanPrint(Rows(27, 2.5, 1000, 10, 4), 170, 237);
     EXPECT_EQ(plan.columnsPerStretch, 57);
     EXPECT_EQ(plan.stretchCount, 18);
     EXPECT_EQ(plan.stretchesPerPage, 5);
@@ -120,7 +119,7 @@ TEST(PrintPlan, StretchesShareAPageWhenTheyFit) {
 
 TEST(PrintPlan, ExactFitsKeepTheirColumnAndStretch) {
     // 143 mm hold exactly 110 columns of 1.3 mm; 237 mm hold exactly 3 stretches of 74 + 5.
-    const CPrintPlan plan = PlanPrint(Rows(26.5, 1.3, 330, 37, 2), 170, 237);
+    const CPrintPlan plan = PlanPrint(Rows(27, 1.3, 330, 37, 2), 170, 237);
     EXPECT_EQ(plan.columnsPerStretch, 110);
     EXPECT_EQ(plan.stretchCount, 3);
     EXPECT_EQ(plan.stretchesPerPage, 3);
@@ -130,7 +129,7 @@ TEST(PrintPlan, ExactFitsKeepTheirColumnAndStretch) {
 TEST(PrintPlan, ATallStretchContinuesOverPagesBetweenRows) {
     // 100 rows of 5 mm in 237 mm: 47 rows a page (235 mm), so runs of 47, 47 and 6. 149.5 mm
     // beside the names hold 74 columns of 2 mm: 3 stretches of 3 pages each.
-    const CPrintPlan plan = PlanPrint(Rows(20, 2, 150, 100, 5), 170, 237);
+    const CPrintPlan plan = PlanPrint(Rows(20.5, 2, 150, 100, 5), 170, 237);
     EXPECT_EQ(plan.stretchCount, 3);
     ASSERT_EQ(plan.rowRuns.size(), 3u);
     EXPECT_EQ(plan.rowRuns[2], std::make_pair(94, 100));
@@ -150,22 +149,14 @@ TEST(PrintPlan, OneColumnWiderThanThePageStillPrints) {
     EXPECT_EQ(plan.stretchCount, 7);
     EXPECT_EQ(plan.pageCount, 1);  // 7 x (12 + 5) = 119 mm
     EXPECT_EQ(plan.PiecesOfPage(0).back(), (CPrintPiece{6, 7, 0, 3, 6 * 17}));
-}
 
-TEST(PrintPlan, LongNamesTakeAtMostHalfTheWidth) {
-    // 2,000 mm of names (a very long molecule name) are cut to 85 mm; 85 mm hold 34 columns.
-    const CPrintPlan plan = PlanPrint(Rows(2000, 2.5, 100, 3, 4), 170, 237);
-    EXPECT_DOUBLE_EQ(plan.leftWidth, 85);
-    EXPECT_EQ(plan.columnsPerStretch, 34);
-    EXPECT_EQ(plan.stretchCount, 3);
-}
-
-TEST(PrintPlan, FitToWidthPutsEveryColumnInOneStretch) {
-    const CPrintPlan plan = PlanPrint(Rows(29.5, 2.5, 1000, 10, 4), 170, 237, true);
-    EXPECT_EQ(plan.stretchCount, 1);
-    EXPECT_EQ(plan.columnsPerStretch, 1000);
-    EXPECT_DOUBLE_EQ(plan.columnWidth, 0.14);  // (170 - 30) / 1000
-    EXPECT_EQ(plan.pageCount, 1);
+    // Names wider than the body (a very long molecule name) leave no room: still one column a
+    // stretch, 13 stretches of 12 mm + 5 a page.
+    const CPrintPlan names = PlanPrint(Rows(2000, 2.5, 100, 3, 4), 170, 237);
+    EXPECT_EQ(names.columnsPerStretch, 1);
+    EXPECT_EQ(names.stretchCount, 100);
+    EXPECT_EQ(names.stretchesPerPage, 13);
+    EXPECT_EQ(names.pageCount, 8);
 }
 
 TEST(PrintPlan, NothingToPrintMakesNoPages) {

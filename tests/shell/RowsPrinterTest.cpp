@@ -86,8 +86,8 @@ struct PdfPrinter {
 
 TEST(RowsPrinter, PrintsThePagesThePlanCountsWithEveryColumnOnce) {
     // On A4 with 20 mm margins, header and footer, the body is 170 x 237 mm. The names (100
-    // pixels = 26.46 mm, plus 0.5) leave 143.04 mm: 54 columns of 2.65 mm a stretch, so 19
-    // stretches for 1000 columns. A stretch is 10 rows x 4.23 mm = 42.33 mm; with the 5 mm gap
+    // pixels = 26.46 mm) leave 143.54 mm: 54 columns of 2.65 mm a stretch, so 19 stretches for
+    // 1000 columns. A stretch is 10 rows x 4.23 mm = 42.33 mm; with the 5 mm gap
     // 5 share a page: 4 pages.
     QTemporaryDir dir;
     const QString path = dir.filePath(QStringLiteral("rows.pdf"));
@@ -117,7 +117,7 @@ TEST(RowsPrinter, LandscapeAndPageRangesChangeThePages) {
     const CFakeRows rows(1000, 10);
     const CRowsPrinter pages(rows, A4Setup(20), Context());
 
-    // Landscape: body 257 x 150 mm, 86 columns (230.04 / 2.6458), 12 stretches, 3 a page.
+    // Landscape: body 257 x 150 mm, 87 columns (230.54 / 2.6458), 12 stretches, 3 a page.
     PdfPrinter landscape(dir.filePath(QStringLiteral("landscape.pdf")));
     landscape.printer.setPageOrientation(QPageLayout::Landscape);
     QString error;

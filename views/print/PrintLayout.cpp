@@ -77,23 +77,14 @@ std::optional<CPageBands> PageBands(QSizeF page, const CPrintSetup& setup) {
     return bands;
 }
 
-CPrintPlan PlanPrint(const CRowsMetrics& rows, double bodyWidth, double bodyHeight,
-                     bool fitToWidth) {
+CPrintPlan PlanPrint(const CRowsMetrics& rows, double bodyWidth, double bodyHeight) {
     CPrintPlan plan;
     plan.columnCount = rows.columnCount;
     if (rows.columnCount <= 0 || rows.rowHeights.empty() || bodyWidth <= 0 || bodyHeight <= 0) {
         return plan;
     }
-    plan.leftWidth = std::min(rows.leftWidth + kNameGapMm, bodyWidth / 2);
-    const double columnRoom = bodyWidth - plan.leftWidth;
-    if (fitToWidth) {
-        plan.columnWidth = columnRoom / rows.columnCount;
-        plan.columnsPerStretch = rows.columnCount;
-    } else {
-        plan.columnWidth = rows.columnWidth;
-        plan.columnsPerStretch =
-            std::min(rows.columnCount, CountFitting(columnRoom, rows.columnWidth, 1));
-    }
+    plan.columnsPerStretch = std::min(
+        rows.columnCount, CountFitting(bodyWidth - rows.leftWidth, rows.columnWidth, 1));
     plan.stretchCount = (rows.columnCount + plan.columnsPerStretch - 1) / plan.columnsPerStretch;
     plan.stretchHeight = std::accumulate(rows.rowHeights.begin(), rows.rowHeights.end(), 0.0);
     plan.rowRuns = SplitRows(rows.rowHeights, bodyHeight);

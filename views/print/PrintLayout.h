@@ -2,8 +2,7 @@
 // Where printed rows go on paper: the page's header, body and footer bands, and the stretches
 // of columns and the pages they fill. Plain geometry in millimetres.
 //
-// A stretch is as many columns as fit beside the names in the body's width (in fit-to-width
-// printing one stretch holds every column). A stretch prints all rows. When one stretch is
+// A stretch is as many columns as fit beside the names in the body's width; it prints all rows. When one stretch is
 // taller than the body it continues over several pages, split between rows; otherwise as many
 // stretches as fit, each followed by a gap, share a page.
 
@@ -17,8 +16,6 @@
 inline constexpr double kMmPerPixel = 25.4 / 96.0;
 inline constexpr double kHeaderBandMm = 10.0;
 inline constexpr double kFooterBandMm = 10.0;
-// Between the names and the first column.
-inline constexpr double kNameGapMm = 0.5;
 // After each stretch that shares a page with others.
 inline constexpr double kStretchGapMm = 5.0;
 
@@ -62,7 +59,7 @@ std::optional<CPageBands> PageBands(QSizeF page, const CPrintSetup& setup);
 
 // What is printed, in millimetres.
 struct CRowsMetrics {
-    double leftWidth = 0;    // names and position numbers
+    double leftWidth = 0;    // names, position numbers and the gap before the columns
     double columnWidth = 0;  // one display column
     int columnCount = 0;
     std::vector<double> rowHeights;  // the rows in print order
@@ -79,8 +76,6 @@ struct CPrintPiece {
 };
 
 struct CPrintPlan {
-    double leftWidth = 0;    // the names' share of the width, gap included
-    double columnWidth = 0;  // as printed
     int columnCount = 0;
     int columnsPerStretch = 0;
     int stretchCount = 0;
@@ -94,8 +89,6 @@ struct CPrintPlan {
     std::vector<CPrintPiece> PiecesOfPage(int page) const;
 };
 
-// Lays out the rows in a body of the given size. The names take at most half the width (longer
-// ones are cut); a stretch holds at least one column, which may be cut at the right edge. No
-// columns make no pages.
-CPrintPlan PlanPrint(const CRowsMetrics& rows, double bodyWidth, double bodyHeight,
-                     bool fitToWidth = false);
+// Lays out the rows in a body of the given size. A stretch holds at least one column, which may
+// be cut at the right edge when the names leave no room. No columns make no pages.
+CPrintPlan PlanPrint(const CRowsMetrics& rows, double bodyWidth, double bodyHeight);

@@ -26,15 +26,14 @@ void EnterPixels(QPainter& painter, double x, double y) {
 }  // namespace
 
 CRowsPrinter::CRowsPrinter(const IPrintableRows& rows, const CPrintSetup& setup,
-                           CPageTextContext context, bool fitToWidth)
-    : m_rows(rows), m_setup(setup), m_context(std::move(context)), m_fitToWidth(fitToWidth) {}
+                           CPageTextContext context)
+    : m_rows(rows), m_setup(setup), m_context(std::move(context)) {}
 
-CRowPrintOptions CRowsPrinter::Options(const CPrintPlan* plan) const {
+CRowPrintOptions CRowsPrinter::Options() {
     CRowPrintOptions options;
     options.printing = true;
-    if (plan && m_fitToWidth) {
-        options.columnWidth = plan->columnWidth / kMmPerPixel;
-    }
+    // At printer resolution the font advances by other widths than on the screen.
+    options.textPerCharacter = true;
     return options;
 }
 
@@ -59,7 +58,7 @@ bool CRowsPrinter::Plan(QSizeF page, CPrintPlan& plan, CPageBands& bands, QStrin
         return false;
     }
     bands = *found;
-    plan = PlanPrint(Metrics(), bands.body.width, bands.body.height, m_fitToWidth);
+    plan = PlanPrint(Metrics(), bands.body.width, bands.body.height);
     if (plan.pageCount == 0) {
         error = QString::fromLatin1(PrintMessages::kNothingToPrint);
         return false;
@@ -129,32 +128,17 @@ void CRowsPrinter::PaintPage(QPainter& painter, const CPrintPlan& plan, const CP
         PaintBand(painter, *bands.footer, m_setup.footer, page, plan.pageCount, false);
     }
     for (const CPrintPiece& piece : plan.PiecesOfPage(page)) {
-        PaintPiece(painter, plan, bands.body, piece);
+        PaintPiece(painter, bands.body, piece);
     }
     painter.restore();
 }
 
-void CRowsPrinter::PaintPiece(QPainter& painter, const CPrintPlan& plan, const CRectMm& body,
+void CRowsPrinter::PaintPiece(QPainter& painter, const CRectMm& body,
                               const CPrintPiece& piece) const {
-    const CRowPrintOptions options = Options(&plan);
-    double height = 0;
-    for (int row = piece.firstRow; row < piece.endRow; ++row) {
-        height += m_rows.PrintRowHeight(row, options);
-    }
-    const double namesWidth = (plan.leftWidth - kNameGapMm) / kMmPerPixel;
-    const double columnsLeft = plan.leftWidth / kMmPerPixel;
-    const double columnsWidth = body.width / kMmPerPixel - columnsLeft;
-    const int paneLeft = m_rows.LeftWidth(options);
     painter.save();
     EnterPixels(painter, body.x, body.y + piece.y);
-    // The names, cut where the plan narrowed them; then the columns, moved to their place.
-    painter.setClipRect(QRectF(0, 0, namesWidth, height));
     m_rows.PaintRange(painter, QPoint(0, 0), piece.firstColumn, piece.endColumn, piece.firstRow,
-                      piece.endRow, options);
-    painter.setClipRect(QRectF(columnsLeft, 0, columnsWidth, height));
-    painter.translate(columnsLeft - paneLeft, 0);
-    m_rows.PaintRange(painter, QPoint(0, 0), piece.firstColumn, piece.endColumn, piece.firstRow,
-                      piece.endRow, options);
+                      piece.endRow, Options());
     painter.restore();
 }
 

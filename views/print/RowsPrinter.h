@@ -16,8 +16,7 @@ class QPrinter;
 class CRowsPrinter {
   public:
     // `context` supplies the date, time and file name of the headers; page fields are set here.
-    CRowsPrinter(const IPrintableRows& rows, const CPrintSetup& setup, CPageTextContext context,
-                 bool fitToWidth = false);
+    CRowsPrinter(const IPrintableRows& rows, const CPrintSetup& setup, CPageTextContext context);
 
     // The rows in millimetres, as printed.
     CRowsMetrics Metrics() const;
@@ -35,16 +34,14 @@ class CRowsPrinter {
     void PreparePage(QPagedPaintDevice& device) const;
     void PaintPage(QPainter& painter, const CPrintPlan& plan, const CPageBands& bands,
                    int page) const;
-    void PaintPiece(QPainter& painter, const CPrintPlan& plan, const CRectMm& body,
-                    const CPrintPiece& piece) const;
+    void PaintPiece(QPainter& painter, const CRectMm& body, const CPrintPiece& piece) const;
     void PaintBand(QPainter& painter, const CRectMm& band, const QString& codes, int page,
                    int pageCount, bool lineBelow) const;
-    CRowPrintOptions Options(const CPrintPlan* plan = nullptr) const;
+    static CRowPrintOptions Options();
 
     const IPrintableRows& m_rows;
     CPrintSetup m_setup;
     CPageTextContext m_context;
-    bool m_fitToWidth;
 };
 
 // The user messages of printing.
