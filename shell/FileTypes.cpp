@@ -4,8 +4,9 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QProcess>
-#include <QSaveFile>
 #include <QStandardPaths>
+
+#include "SafeSave.h"
 
 namespace {
 
@@ -13,12 +14,7 @@ const char kDefaultsGroup[] = "[Default Applications]";
 
 bool WriteText(const QString& path, const QString& text) {
     QDir().mkpath(QFileInfo(path).absolutePath());
-    QSaveFile file(path);
-    if (!file.open(QIODevice::WriteOnly)) {
-        return false;
-    }
-    file.write(text.toUtf8());
-    return file.commit();
+    return SaveFileContents(path, text.toUtf8());
 }
 
 QString ReadText(const QString& path) {

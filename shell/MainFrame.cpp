@@ -8,7 +8,6 @@
 #include <QFile>
 #include <QMenuBar>
 #include <QMimeData>
-#include <QSaveFile>
 #include <QShortcut>
 #include <QStatusBar>
 #include <QTemporaryDir>

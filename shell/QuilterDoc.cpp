@@ -5,7 +5,6 @@
 #include <QDir>
 #include <QFileDialog>
 #include <QFileInfo>
-#include <QSaveFile>
 #include <QStandardPaths>
 
 #include "BlockProject.h"
@@ -15,6 +14,7 @@
 #include "MoleculeSelection.h"
 #include "PageSetupDlg.h"
 #include "ProgressDlg.h"
+#include "SafeSave.h"
 #include "Settings.h"
 #include "TcxMsgBox.h"
 #include "archive/FileIO.h"
@@ -25,12 +25,9 @@ namespace {
 const char kProjectFilter[] = "Tiler Blocks Projects (*.bpr)";
 const char kTemplateFilters[] = "Tiler Blocks templates(*.bp1);;All files(*.*)";
 
-bool WriteAtomically(const QString& path, const std::string& bytes) {
-    QSaveFile file(path);
-    return file.open(QIODevice::WriteOnly) &&
-           file.write(bytes.data(), static_cast<qint64>(bytes.size())) ==
-               static_cast<qint64>(bytes.size()) &&
-           file.commit();
+// The message of a failed save, with the system's reason on its own line.
+QString SaveFailureText(const QString& message, const QString& reason) {
+    return reason.isEmpty() ? message : message + QLatin1Char('\n') + reason;
 }
 
 }  // namespace
@@ -125,15 +122,19 @@ bool CQuilterDoc::OnOpenDocument(const QString& path) {
 bool CQuilterDoc::OnSaveDocument(const QString& path) {
     QApplication::setOverrideCursor(Qt::WaitCursor);
     bool ok = true;
+    QString reason;
     try {
         m_project->Save(path.toStdString());
-    } catch (const CFileException&) {
+    } catch (const CFileException& e) {
         ok = false;
+        reason = QString::fromLocal8Bit(e.Reason());
     }
     QApplication::restoreOverrideCursor();
     if (!ok) {
-        CTcxMsgBox::Show(DialogParent(), QStringLiteral("Error saving '%1' file").arg(path),
-                         MB_OK | MB_ICONEXCLAMATION);
+        CTcxMsgBox::Show(
+            DialogParent(),
+            SaveFailureText(QStringLiteral("Error saving '%1' file").arg(path), reason),
+            MB_OK | MB_ICONEXCLAMATION);
     }
     return ok;
 }
@@ -287,9 +288,12 @@ void CQuilterDoc::ExportMolecules() {
         }
     }
     const QString path = dialog.selectedFiles().front();
-    if (!WriteAtomically(path, ::ExportMolecules(molecules, filter))) {
-        CTcxMsgBox::Show(DialogParent(), QStringLiteral("Error opening '%1' file").arg(path),
-                         MB_OK | MB_ICONEXCLAMATION);
+    QString reason;
+    if (!SaveFileContents(path, ::ExportMolecules(molecules, filter), &reason)) {
+        CTcxMsgBox::Show(
+            DialogParent(),
+            SaveFailureText(QStringLiteral("Error opening '%1' file").arg(path), reason),
+            MB_OK | MB_ICONEXCLAMATION);
     }
 }
 
@@ -306,9 +310,11 @@ void CQuilterDoc::ExportMsf() {
         return;
     }
     const QString path = dialog.selectedFiles().front();
-    if (!WriteAtomically(path, msf.Write())) {
-        CTcxMsgBox::Show(DialogParent(), QStringLiteral("Error opening '%1' file").arg(path),
-                         MB_OK);
+    QString reason;
+    if (!SaveFileContents(path, msf.Write(), &reason)) {
+        CTcxMsgBox::Show(
+            DialogParent(),
+            SaveFailureText(QStringLiteral("Error opening '%1' file").arg(path), reason), MB_OK);
     }
 }
 
