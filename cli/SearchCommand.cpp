@@ -184,6 +184,11 @@ std::string FailureText(const CSearchOutcome& outcome, const CBlockProject& proj
             return "not enough memory for its diagonals and blocks";
         case CSimTool::kTooManyDiagonals:
             return "the molecules match at too many offsets (a higher --cutoff helps)";
+        case CSimTool::kTooManyHits:
+            return "the pairwise comparisons found more hits than a search can expand (a higher "
+                   "--cutoff helps)";
+        case CSimTool::kNotEnoughMemory:
+            return "the molecules need more memory than the system has";
         default:
             return "the search did not complete";
     }
