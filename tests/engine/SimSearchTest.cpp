@@ -9,18 +9,11 @@
 #include "SimBlockParameters.h"
 #include "SimBlockSet.h"
 #include "SimTool.h"
+#include "engine/SearchEntries.h"
 #include "search/DiagonalScan.h"
 #include "search/MemoryStatus.h"
 
 namespace {
-
-std::vector<CSxMolEntry> Entries(const std::vector<std::string>& sequences) {
-    std::vector<CSxMolEntry> entries;
-    for (std::size_t i = 0; i < sequences.size(); ++i) {
-        entries.emplace_back("K" + std::to_string(i), "m" + std::to_string(i), sequences[i]);
-    }
-    return entries;
-}
 
 // Records what the engine reports; can cancel at a given step and pretend memory is low.
 class CRecordingTool : public CSimTool {
