@@ -16,6 +16,8 @@ namespace {
 constexpr int kFitRightMargin = 4;
 constexpr int kAutoScrollInterval = 60;  // milliseconds between automatic scroll steps
 constexpr int kPrintGap = 5;             // between the left areas and the columns on paper
+// Names on paper are cut to this width at most: a very long name must leave room for columns.
+constexpr int kMaxPrintedNameWidth = 320;
 
 bool IsCtrl(Qt::KeyboardModifiers modifiers) {
     return modifiers & Qt::ControlModifier;
@@ -27,6 +29,12 @@ bool IsShift(Qt::KeyboardModifiers modifiers) {
 
 CColumnRange Ordered(int a, int b) {
     return {std::min(a, b), std::max(a, b)};
+}
+
+// Clamps [first, end) into [0, count).
+void ClampRange(int& first, int& end, int count) {
+    first = std::clamp(first, 0, count);
+    end = std::clamp(end, first, count);
 }
 
 }  // namespace
@@ -475,10 +483,16 @@ int CTilxCtrl::PrintRowHeight(int row, const CRowPrintOptions&) const {
     return row >= 0 && row < static_cast<int>(rows.size()) ? m_rows[rows[row]]->RowHeight() : 0;
 }
 
+int CTilxCtrl::PrintedNameWidth() const {
+    return m_flags.showNames ? std::min(WidestNameWidth() + 10, kMaxPrintedNameWidth) : 0;
+}
+
+int CTilxCtrl::PrintedNumberWidth() const {
+    return m_flags.showNumbers && m_flags.characterMode ? NumberAreaWidth() : 0;
+}
+
 int CTilxCtrl::LeftWidth(const CRowPrintOptions&) const {
-    const int names = m_flags.showNames ? WidestNameWidth() + 10 : 0;
-    const int numbers = m_flags.showNumbers && m_flags.characterMode ? NumberAreaWidth() : 0;
-    return names + numbers + kPrintGap;
+    return PrintedNameWidth() + PrintedNumberWidth() + kPrintGap;
 }
 
 double CTilxCtrl::ColumnWidth(const CRowPrintOptions& options) const {
@@ -490,10 +504,8 @@ double CTilxCtrl::ColumnWidth(const CRowPrintOptions& options) const {
 QSize CTilxCtrl::ContentSize(int firstColumn, int endColumn, int firstRow, int endRow,
                              const CRowPrintOptions& options) const {
     const std::vector<int> rows = PrintRows();
-    firstRow = std::clamp(firstRow, 0, static_cast<int>(rows.size()));
-    endRow = std::clamp(endRow, firstRow, static_cast<int>(rows.size()));
-    firstColumn = std::clamp(firstColumn, 0, m_columnCount);
-    endColumn = std::clamp(endColumn, firstColumn, m_columnCount);
+    ClampRange(firstRow, endRow, static_cast<int>(rows.size()));
+    ClampRange(firstColumn, endColumn, m_columnCount);
     int height = 0;
     for (int i = firstRow; i < endRow; ++i)
         height += m_rows[rows[i]]->RowHeight();
@@ -504,13 +516,11 @@ QSize CTilxCtrl::ContentSize(int firstColumn, int endColumn, int firstRow, int e
 void CTilxCtrl::PaintRange(QPainter& painter, QPoint origin, int firstColumn, int endColumn,
                            int firstRow, int endRow, const CRowPrintOptions& options) const {
     const std::vector<int> rows = PrintRows();
-    firstRow = std::clamp(firstRow, 0, static_cast<int>(rows.size()));
-    endRow = std::clamp(endRow, firstRow, static_cast<int>(rows.size()));
-    firstColumn = std::clamp(firstColumn, 0, m_columnCount);
-    endColumn = std::clamp(endColumn, firstColumn, m_columnCount);
+    ClampRange(firstRow, endRow, static_cast<int>(rows.size()));
+    ClampRange(firstColumn, endColumn, m_columnCount);
     RowFrame frame;
-    frame.nameWidth = m_flags.showNames ? WidestNameWidth() + 10 : 0;
-    frame.numberWidth = m_flags.showNumbers && m_flags.characterMode ? NumberAreaWidth() : 0;
+    frame.nameWidth = PrintedNameWidth();
+    frame.numberWidth = PrintedNumberWidth();
     frame.axis = {frame.nameWidth + frame.numberWidth + kPrintGap, ColumnWidth(options),
                   firstColumn, m_columnCount};
     frame.endColumn = endColumn;

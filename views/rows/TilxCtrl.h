@@ -158,6 +158,8 @@ class CTilxCtrl : public QAbstractScrollArea, public IPrintableRows {
 
     int WidestNameWidth() const;
     int NumberAreaWidth() const;
+    int PrintedNameWidth() const;
+    int PrintedNumberWidth() const;
     double CharacterScale() const;
     void UpdateScrollBars();
     void UpdatePlacements();
