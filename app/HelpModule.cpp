@@ -1,10 +1,10 @@
-// The help module: loaded by name when the user asks for help, it opens the manual that comes
-// with the program in the user's browser.
+// The help module: loaded by name when the user asks for help, it shows the manual that comes
+// with the program in the program's own help window.
 #include <QCoreApplication>
-#include <QDesktopServices>
 #include <QDir>
 #include <QFileInfo>
-#include <QUrl>
+
+#include "HelpWindow.h"
 
 namespace {
 
@@ -28,7 +28,8 @@ int OpenPage(const QString& page) {
     if (dir.isEmpty() || name.isEmpty() || !QFileInfo::exists(dir + QLatin1Char('/') + name)) {
         return 0;
     }
-    return QDesktopServices::openUrl(QUrl::fromLocalFile(dir + QLatin1Char('/') + name)) ? 1 : 0;
+    CHelpWindow::Instance(dir)->ShowPage(name);
+    return 1;
 }
 
 }  // namespace

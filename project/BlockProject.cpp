@@ -57,15 +57,15 @@ void CBlockProject::RemapEntryKeys(const CBlockProject& source) {
     m_blockSet = std::move(remapped);
 }
 
-std::string CBlockProject::ImportExceptionMessage() {
-    return "CMolListException occured";
+std::string CBlockProject::ImportExceptionMessage(const CMolListException& exception) {
+    return std::string("CMolListException occured\n") + exception.what();
 }
 
 bool CBlockProject::AddFile(const std::string& path, IUserPrompt& prompt) {
     try {
         return m_molecules->AddFile(path, prompt);
-    } catch (const CMolListException&) {
-        prompt.ShowMessage(ImportExceptionMessage(), MessageIcon::error);
+    } catch (const CMolListException& e) {
+        prompt.ShowMessage(ImportExceptionMessage(e), MessageIcon::error);
         return false;
     }
 }

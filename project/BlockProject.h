@@ -20,6 +20,7 @@
 #include "links/LinkHistory.h"
 #include "links/LinkList.h"
 #include "molecule/MolList.h"
+#include "molecule/MolListException.h"
 #include "msf/MsfExport.h"
 
 // Everything a block search reads, copied from the project when the search starts, and the
@@ -60,7 +61,8 @@ class CBlockProject : public CSerializable {
     // Molecules.
     //
     // Imports every molecule of a sequence file; false when nothing could be added (an
-    // unreadable file is reported as "CMolListException occured").
+    // unreadable file is reported as "CMolListException occured" and, on a second line, the
+    // file and why).
     bool AddFile(const std::string& path, IUserPrompt& prompt);
     int MoleculeCount() const { return m_molecules->Count(); }
     int MoleculeType() const { return m_molecules->MolType(); }
@@ -157,7 +159,9 @@ class CBlockProject : public CSerializable {
     // residues of the molecules they name) and its history holds the loaded links only.
     void Serialize(CArchive& ar) override;
 
-    static std::string ImportExceptionMessage();
+    // The message for a file that could not be read at all: the fixed first line, then the file
+    // and the system's reason.
+    static std::string ImportExceptionMessage(const CMolListException& exception);
 
   private:
     void RemapEntryKeys(const CBlockProject& source);

@@ -1,5 +1,7 @@
 #include "PageSetupDlg.h"
 
+#include <QLabel>
+
 #include <QDialogButtonBox>
 #include <QFormLayout>
 #include <QLocale>
@@ -21,6 +23,13 @@ int CPageSetupDlg::Convert(int value, bool fromMetric, bool toMetric) {
     }
     // 1 inch = 25.4 mm: 1000 thousandths of an inch = 2540 hundredths of a millimetre.
     return static_cast<int>(std::lround(toMetric ? value * 2.54 : value / 2.54));
+}
+
+QString CPageSetupDlg::HeaderCodesLegend() {
+    return QStringLiteral(
+        "<small>Codes: <b>&amp;D</b> date, <b>&amp;T</b> time, <b>&amp;p</b> page number, "
+        "<b>&amp;s</b> file name. <b>&amp;l</b>, <b>&amp;c</b> and <b>&amp;r</b> place the text "
+        "before them at the left, centre or right.</small>");
 }
 
 CPageSetupDlg::CPageSetupDlg(const CPageSetup& setup, QWidget* parent)
@@ -63,6 +72,13 @@ CPageSetupDlg::CPageSetupDlg(const CPageSetup& setup, QWidget* parent)
     }
     form->addRow(QStringLiteral("&Header:"), m_header);
     form->addRow(QStringLiteral("&Footer:"), m_footer);
+    auto* legend = new QLabel(HeaderCodesLegend(), this);
+    legend->setObjectName(QStringLiteral("headerCodes"));
+    legend->setWordWrap(true);
+    legend->setTextFormat(Qt::RichText);
+    form->addRow(QString(), legend);
+    m_header->setToolTip(HeaderCodesLegend());
+    m_footer->setToolTip(HeaderCodesLegend());
     auto* buttons = new QDialogButtonBox(QDialogButtonBox::Ok | QDialogButtonBox::Cancel, this);
     connect(buttons, &QDialogButtonBox::accepted, this, &QDialog::accept);
     connect(buttons, &QDialogButtonBox::rejected, this, &QDialog::reject);

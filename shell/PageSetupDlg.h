@@ -21,6 +21,8 @@ class CPageSetupDlg : public QDialog {
     static double UnitsPerShown(bool metric) { return metric ? 100.0 : 1000.0; }
     // Converts stored lengths from one unit system to the other.
     static int Convert(int value, bool fromMetric, bool toMetric);
+    // What the codes of the header and footer fields stand for, shown beside them.
+    static QString HeaderCodesLegend();
 
     QComboBox* PaperSize() const { return m_paper; }
     QDoubleSpinBox* Margin(int index) const { return m_margins[index]; }

@@ -39,6 +39,8 @@ bool CQuilterApp::InitInstance(const QStringList& arguments, bool registerFileTy
     m_frame = std::make_unique<CMainFrame>(*this, *m_document, m_settings, *m_router);
     connect(m_document.get(), &CQuilterDoc::titleChanged, m_frame.get(),
             [this](const QString& title) { m_frame->setWindowTitle(title); });
+    connect(m_document.get(), &CQuilterDoc::modifiedChanged, m_frame.get(),
+            &QWidget::setWindowModified);
     QString error;
     if (!m_frame->Create(error)) {
         CTcxMsgBox::Show(nullptr, error, MB_OK | MB_ICONHAND);

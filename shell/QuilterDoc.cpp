@@ -52,13 +52,17 @@ QString CQuilterDoc::Title() const {
 }
 
 void CQuilterDoc::SetModifiedFlag(bool modified) {
+    const bool was = m_modified;
     m_modified = modified;
+    if (was != modified)
+        emit modifiedChanged(modified);
     emit changed();
 }
 
 void CQuilterDoc::SetPathName(const QString& path) {
     m_pathName = path.isEmpty() ? QString() : QFileInfo(path).absoluteFilePath();
-    emit titleChanged(Title() + QStringLiteral(" - Tiler Blocks"));
+    // "[*]" is where the window shows its modified mark.
+    emit titleChanged(Title() + QStringLiteral("[*] - Tiler Blocks"));
     if (!m_pathName.isEmpty()) {
         emit fileUsed(m_pathName);
     }

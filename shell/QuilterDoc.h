@@ -67,6 +67,8 @@ class CQuilterDoc : public QObject, public ICommandTarget, public IPaneDocument 
     // The project or its file changed: commands may change their state.
     void changed();
     void titleChanged(const QString& windowTitle);
+    // The project now differs from its file (or no longer does).
+    void modifiedChanged(bool modified);
     // A project file was opened or saved (for the recent-file list).
     void fileUsed(const QString& path);
 

@@ -131,3 +131,17 @@ std::vector<CBlockRowRange> BlockRowRanges(const CAlignmentLayout& alignment,
     }
     return ranges;
 }
+
+std::optional<ALN_BSEL_ENTRY> ResidueSelection(const CAlignmentLayout& layout,
+                                               const std::string& name, int first, int last) {
+    const int row = layout.IndexOfRow(name);
+    if (row < 0)
+        return std::nullopt;
+    const CSegmentRow& segments = layout.RowAt(row).segments;
+    const int low = std::min(first, last);
+    const int high = std::max(first, last);
+    if (low < 0 || high >= segments.SequenceLength())
+        return std::nullopt;
+    return ALN_BSEL_ENTRY{name, segments.PositionToColumn(low),
+                          segments.PositionToColumn(high) + 1};
+}

@@ -61,3 +61,9 @@ struct CBlockRowRange {
 std::vector<CBlockRowRange> BlockRowRanges(const CAlignmentLayout& alignment,
                                            const CSimBlock& block,
                                            CSimBlock::Layout layout = CSimBlock::kCurrent);
+
+// The selection entry over residues `first` .. `last` (0-based, inclusive, either order) of the
+// row named `name`: from the column of the first residue to one past the column of the last.
+// None when there is no such row or the residues lie outside its sequence.
+std::optional<ALN_BSEL_ENTRY> ResidueSelection(const CAlignmentLayout& layout,
+                                               const std::string& name, int first, int last);

@@ -1,6 +1,7 @@
 #include "molecule/MolList.h"
 
 #include <algorithm>
+#include <filesystem>
 
 #include "archive/FileIO.h"
 #include "import/ImportResult.h"
@@ -18,9 +19,25 @@ std::string WrongTypeMessage(int fileType) {
            " acid sequence to " + (nucleic ? "an amino" : "a nucleic") + " acid project.";
 }
 
+// Binary data (a NUL byte) is no sequence file of any format, raw sequence included.
+bool HoldsBinaryData(CSxStream& stream) {
+    bool binary = false;
+    for (std::string line; !binary && stream.ReadLine(line);)
+        binary = line.find('\0') != std::string::npos;
+    stream.Rewind();
+    return binary;
+}
+
+// The file's contents; a file that cannot be read at all throws, naming the file and why.
 CSxStream OpenForImport(const std::string& path) {
+    std::error_code error;
+    if (std::filesystem::is_directory(path, error))
+        throw CMolListException(kImportUnreadable, path + ": is a folder, not a file");
     try {
-        return CSxStream::FromFile(path);
+        CSxStream stream = CSxStream::FromFile(path);
+        if (HoldsBinaryData(stream))
+            throw CMolListException(kImportUnreadable, path + ": not a sequence file");
+        return stream;
     } catch (const CFileException& e) {
         throw CMolListException(kImportUnreadable, e.what());
     }

@@ -1,4 +1,7 @@
 #include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <filesystem>
 
 #include "ProjectFixtures.h"
 
@@ -255,10 +258,31 @@ TEST_F(BlockProjectTest, CopiesGetNewKeysAndTheirBlocksFollowThem) {
     EXPECT_EQ(copy.MoleculeUse("beta"), CSimBlockSet::kInBlocks);
 }
 
-TEST_F(BlockProjectTest, UnreadableFileIsReportedAsAnImportException) {
-    EXPECT_FALSE(project.AddFile(dir.File("missing.fa"), prompt));
-    ASSERT_EQ(prompt.Messages().size(), 1u);
-    EXPECT_EQ(prompt.Messages()[0].text, "CMolListException occured");
+// A file that cannot be read at all keeps the fixed first line and names the file and why.
+TEST_F(BlockProjectTest, UnreadableFilesAreReportedWithTheFileAndTheReason) {
+    std::filesystem::create_directories(dir.File("folder.fa"));
+    const std::string binary = dir.Write("binary.fa", std::string(">x\nMKV\0\x01LL\n", 12));
+    const std::pair<std::string, std::string> cases[] = {
+        {dir.File("missing.fa"), "No such file or directory"},
+        {dir.File("folder.fa"), "is a folder, not a file"},
+        {binary, "not a sequence file"},
+    };
+    for (const auto& [path, reason] : cases) {
+        CRecordingPrompt recorder;
+        EXPECT_FALSE(project.AddFile(path, recorder)) << path;
+        ASSERT_EQ(recorder.Messages().size(), 1u) << path;
+        EXPECT_EQ(recorder.Messages()[0].text,
+                  "CMolListException occured\n" + path + ": " + reason);
+    }
+    if (::geteuid() != 0) {  // root reads any file
+        const std::string locked = dir.Write("locked.fa", ">x\nMKV\n");
+        std::filesystem::permissions(locked, std::filesystem::perms::none);
+        CRecordingPrompt recorder;
+        EXPECT_FALSE(project.AddFile(locked, recorder));
+        ASSERT_EQ(recorder.Messages().size(), 1u);
+        EXPECT_EQ(recorder.Messages()[0].text,
+                  "CMolListException occured\n" + locked + ": Permission denied");
+    }
     EXPECT_EQ(project.MoleculeCount(), 3);
 }
 

@@ -14,6 +14,7 @@
 #include <QTest>
 #include <QToolBar>
 #include <QUrl>
+#include <QWindow>
 #include <fstream>
 #include <memory>
 
@@ -97,6 +98,9 @@ class FrameTest : public ::testing::Test {
     }
 
     // Selects the first `count` molecules of the text pane.
+    // The title the window system shows, with the modified mark in place.
+    QString ShownTitle() { return Frame().windowHandle()->title(); }
+
     void SelectFirst(int count) {
         std::vector<std::string> names;
         for (int i = 0; i < count; ++i) {
@@ -114,7 +118,7 @@ class FrameTest : public ::testing::Test {
 TEST_F(FrameTest, StartsWithNoSettings) {
     Start();
     EXPECT_TRUE(Frame().isVisible());
-    EXPECT_EQ(Frame().windowTitle(), QStringLiteral("Untitled - Tiler Blocks"));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("Untitled - Tiler Blocks"));
     EXPECT_EQ(Frame().ViewManager().Compose(), QStringLiteral("({0,1},{2,3})"));
     EXPECT_EQ(Frame().ActivePane(), Frame().Pane(kTextPane));
     EXPECT_EQ(Doc().Project()->MoleculeCount(), 0);
@@ -269,7 +273,7 @@ TEST_F(FrameTest, SaveNewOpenGivesBackTheSameProject) {
     const QString path = folder.filePath("globins.bpr");
     ASSERT_TRUE(Doc().DoSave(path));
     EXPECT_FALSE(Doc().IsModified());
-    EXPECT_EQ(Frame().windowTitle(), QStringLiteral("globins.bpr - Tiler Blocks"));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("globins.bpr - Tiler Blocks"));
     const std::vector<std::uint8_t> saved = FileBytes(path);
     const int molecules = Doc().Project()->MoleculeCount();
     const int blocks = Doc().Project()->BlockSet().BlockCount();
@@ -293,6 +297,27 @@ TEST_F(FrameTest, SaveNewOpenGivesBackTheSameProject) {
     EXPECT_FALSE(app->OpenDocumentFile(kExample));
     EXPECT_EQ(Doc().PathName(), QFileInfo(path).absoluteFilePath());
     EXPECT_EQ(Doc().Project()->BlockSet().BlockCount(), blocks);
+}
+
+// The title carries the modified mark exactly while the project differs from its file.
+TEST_F(FrameTest, TitleShowsTheModifiedMark) {
+    Start({kExample});
+    EXPECT_EQ(ShownTitle(), QStringLiteral("Untitled* - Tiler Blocks"));
+    const QString path = folder.filePath("globins.bpr");
+    ASSERT_TRUE(Doc().DoSave(path));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("globins.bpr - Tiler Blocks"));
+    SelectFirst(5);
+    ASSERT_TRUE(Run(ID_SEARCH_BLOCKS));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("globins.bpr* - Tiler Blocks"));
+    ASSERT_TRUE(Run(ID_FILE_SAVE));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("globins.bpr - Tiler Blocks"));
+    EXPECT_FALSE(Doc().IsModified());
+    // Another project replaces the mark with its own state.
+    ASSERT_TRUE(Doc().AddFiles({kExample}));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("globins.bpr* - Tiler Blocks"));
+    m_answer = IDNO;
+    ASSERT_TRUE(Run(ID_FILE_NEW));
+    EXPECT_EQ(ShownTitle(), QStringLiteral("Untitled - Tiler Blocks"));
 }
 
 TEST_F(FrameTest, AsksBeforeDroppingChangesAndHonoursCancel) {

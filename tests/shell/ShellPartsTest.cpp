@@ -1,11 +1,16 @@
 #include <gtest/gtest.h>
 
+#include <QApplication>
 #include <QDesktopServices>
 #include <QDir>
 #include <QFile>
+#include <QLabel>
+#include <QLineEdit>
 #include <QSet>
 #include <QSharedMemory>
 #include <QStandardPaths>
+#include <QTest>
+#include <QTextBrowser>
 #include <cstring>
 
 #include "CommandIds.h"
@@ -205,6 +210,15 @@ TEST(PageSetup, DefaultsConversionAndTheDialog) {
     EXPECT_EQ(result.marginT, metric ? 2000 : 1000);
     EXPECT_EQ(result.pageSizeX, metric ? 21000 : 8268);  // 210 mm
     EXPECT_EQ(result.footer, QStringLiteral("&p"));
+    // Every code of the default header and footer is explained beside the fields.
+    const auto* legend = dialog.findChild<QLabel*>("headerCodes");
+    ASSERT_NE(legend, nullptr);
+    const QString codes = defaults.header + defaults.footer + QStringLiteral("&T&r");
+    for (qsizetype at = codes.indexOf('&'); at >= 0; at = codes.indexOf('&', at + 1)) {
+        const QString explained = QStringLiteral("<b>&amp;") + codes[at + 1] + QStringLiteral("</b>");
+        EXPECT_TRUE(legend->text().contains(explained)) << codes.mid(at, 2).toStdString();
+    }
+    EXPECT_EQ(dialog.Header()->toolTip(), legend->text());
     settings.SavePageSetup(result);
     EXPECT_EQ(settings.LoadPageSetup().marginT, result.marginT);
     EXPECT_EQ(settings.LoadPageSetup().orientation, 1);  // written only at exit
@@ -219,17 +233,55 @@ class UrlCatcher : public QObject {
     void Open(const QUrl& url) { urls << url; }
 };
 
-TEST(HelpModule, LoadsByNameAndOpensTheManual) {
+QWidget* HelpWindow() {
+    for (QWidget* widget : QApplication::topLevelWidgets()) {
+        if (widget->objectName() == "helpWindow")
+            return widget;
+    }
+    return nullptr;
+}
+
+// Help needs no web browser: the manual opens in the program's own window, where its links,
+// Back and Find work.
+TEST(HelpModule, ShowsTheManualInItsOwnWindow) {
     UrlCatcher catcher;
     QDesktopServices::setUrlHandler("file", &catcher, "Open");
     ASSERT_TRUE(CHelpModule::OpenHelpFile("QUILTER", "Tiler Blocks"));
     EXPECT_TRUE(CHelpModule::LoadedPath().contains("HelpModule"));
-    ASSERT_EQ(catcher.urls.size(), 1);
-    EXPECT_TRUE(catcher.urls[0].toLocalFile().endsWith("/index.html"));
-    EXPECT_TRUE(CHelpModule::OpenHelpPage("linking.html"));
+    EXPECT_TRUE(catcher.urls.isEmpty());
+    QWidget* window = HelpWindow();
+    ASSERT_NE(window, nullptr);
+    EXPECT_TRUE(window->isVisible());
+    auto* browser = window->findChild<QTextBrowser*>();
+    ASSERT_NE(browser, nullptr);
+    EXPECT_EQ(browser->documentTitle(), "Tiler Blocks manual");
+    EXPECT_TRUE(browser->source().toLocalFile().endsWith("/index.html"));
+    EXPECT_TRUE(browser->toPlainText().contains("A first search in five steps"));
+    EXPECT_EQ(window->windowTitle(), "Tiler Blocks manual - Tiler Blocks Help");
+
+    ASSERT_TRUE(CHelpModule::OpenHelpPage("linking.html"));
+    EXPECT_EQ(HelpWindow(), window);  // one window for every page
+    EXPECT_TRUE(browser->source().toLocalFile().endsWith("/linking.html"));
+    ASSERT_TRUE(browser->isBackwardAvailable());
+    browser->backward();
+    EXPECT_TRUE(browser->source().toLocalFile().endsWith("/index.html"));
     EXPECT_FALSE(CHelpModule::OpenHelpPage("no-such-page.html"));
     EXPECT_FALSE(CHelpModule::OpenHelpPage("../../etc/passwd"));
+    EXPECT_TRUE(browser->source().toLocalFile().endsWith("/index.html"));
+
+    auto* find = window->findChild<QLineEdit*>("findField");
+    ASSERT_NE(find, nullptr);
+    QTest::keyClicks(find, "conserved blocks");
+    QTest::keyClick(find, Qt::Key_Return);
+    EXPECT_EQ(browser->textCursor().selectedText(), "conserved blocks");
+    find->clear();
+    QTest::keyClicks(find, "xylophone");
+    QTest::keyClick(find, Qt::Key_Return);
+    EXPECT_FALSE(browser->textCursor().hasSelection());
+    EXPECT_EQ(find->toolTip(), "Not found on this page");
+    EXPECT_TRUE(catcher.urls.isEmpty());
     QDesktopServices::unsetUrlHandler("file");
+    window->close();
 }
 
 }  // namespace
