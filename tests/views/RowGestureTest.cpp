@@ -33,6 +33,14 @@ TEST_F(AlnPaneTest, BandSelectsTheColumnsOfEveryRowItMeets) {
     EXPECT_EQ(m_pane.SelectionEntries(), (Entries{{"A", 0, 4}, {"B", 0, 4}}));
 }
 
+TEST_F(AlnPaneTest, ColumnModeSelectsTheColumnsInEveryRow) {
+    CTilxCtrl::Flags flags = Ctrl().GetFlags();
+    flags.perRowSelection = false;
+    Ctrl().SetFlags(flags);
+    Drag(Cell("B", 9), Cell("B", 11));
+    EXPECT_EQ(m_pane.SelectionEntries(), (Entries{{"A", 9, 12}, {"B", 9, 12}, {"C", 9, 12}}));
+}
+
 TEST_F(AlnPaneTest, CtrlAddsAndCoversExistingRanges) {
     Drag(Cell("A", 1), Cell("A", 2));
     Drag(Cell("A", 8), Cell("B", 9), Qt::ControlModifier);
