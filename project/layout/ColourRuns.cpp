@@ -3,6 +3,12 @@
 #include <algorithm>
 #include <set>
 
+namespace {
+
+constexpr std::uint32_t kLowBits = 0xFFFFFFu;
+
+}  // namespace
+
 CColourRuns::CColourRuns(std::span<const CSimColorSegment> segments,
                          const BlockColourLookup& colourOf) {
     struct Event {
@@ -22,21 +28,25 @@ CColourRuns::CColourRuns(std::span<const CSimColorSegment> segments,
     }
     std::sort(events.begin(), events.end(),
               [](const Event& a, const Event& b) { return a.position < b.position; });
-    // The ranges holding the current run, in their own order: the order decides the colour.
+    // Laying c over x gives (not x) xor c in the low 24 bits and c's top byte, so the colour of
+    // n ranges is the xor of their low bits (inverted when n is even) under the top byte of the
+    // last range in list order: kept up to date as ranges start and end.
     std::set<int> active;
+    std::uint32_t lowBits = 0;
     for (std::size_t e = 0; e < events.size();) {
         const int position = events[e].position;
         for (; e < events.size() && events[e].position == position; ++e) {
+            const int segment = events[e].segment;
             if (events[e].starts)
-                active.insert(events[e].segment);
+                active.insert(segment);
             else
-                active.erase(events[e].segment);
+                active.erase(segment);
+            lowBits ^= colours[segment] & kLowBits;
         }
         std::uint32_t colour = kNoColour;
-        bool found = false;
-        for (int segment : active) {
-            colour = found ? OverlayColour(colour, colours[segment]) : colours[segment];
-            found = true;
+        if (!active.empty()) {
+            const std::uint32_t inverted = active.size() % 2 == 0 ? kLowBits : 0;
+            colour = ((lowBits ^ inverted) & kLowBits) | (colours[*active.rbegin()] & ~kLowBits);
         }
         m_starts.push_back(position);
         m_colours.push_back(colour);

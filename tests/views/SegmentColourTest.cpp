@@ -9,18 +9,24 @@
 
 namespace {
 
-// Block identifier i has colour 0x10101 * i (distinct, and xor-able).
+// Block identifier i has colour 0x10101 * i (distinct, and xor-able), palette-relative for
+// multiples of 3; block 99 does not exist.
 std::uint32_t ColourOfBlock(int identifier) {
-    return identifier == 99 ? kNoColour : 0x010101u * static_cast<std::uint32_t>(identifier);
+    if (identifier == 99)
+        return kNoColour;
+    const std::uint32_t palette = identifier % 3 == 0 ? 0x02000000u : 0;
+    return palette | 0x010101u * static_cast<std::uint32_t>(identifier);
 }
 
 std::vector<CSimColorSegment> RandomRanges(std::mt19937& random, int length, int count) {
     std::uniform_int_distribution<int> start(-3, length);
     std::uniform_int_distribution<int> width(0, 12);
-    std::uniform_int_distribution<int> block(1, 9);
+    std::uniform_int_distribution<int> block(1, 10);
     std::vector<CSimColorSegment> ranges;
-    for (int i = 0; i < count; ++i)
-        ranges.emplace_back(block(random), start(random), width(random));
+    for (int i = 0; i < count; ++i) {
+        const int identifier = block(random);
+        ranges.emplace_back(identifier == 10 ? 99 : identifier, start(random), width(random));
+    }
     return ranges;
 }
 
@@ -70,10 +76,10 @@ TEST(SegmentWnd, GapTakesTheColourOfARangeOnBothSides) {
     row.AddColourSegment({3, 5, 8});
     row.AddColourSegment({4, 15, 5});
     for (int column = 10; column < 16; ++column)
-        EXPECT_EQ(row.BackgroundAt(column), 0x030303u) << "gap inside block 3, column " << column;
+        EXPECT_EQ(row.BackgroundAt(column), 0x02030303u) << "gap inside block 3, column " << column;
     for (int column = 26; column < 30; ++column)
         EXPECT_EQ(row.BackgroundAt(column), kNoColour) << "gap at the edge of block 4";
-    EXPECT_EQ(row.BackgroundAt(16), 0x030303u) << "residue 10";
+    EXPECT_EQ(row.BackgroundAt(16), 0x02030303u) << "residue 10";
     EXPECT_EQ(row.BackgroundAt(19), kNoColour) << "residue 13";
     EXPECT_EQ(row.BackgroundAt(25), 0x040404u) << "residue 19";
     EXPECT_EQ(row.BackgroundAt(40), kNoColour) << "beyond the row";

@@ -24,6 +24,7 @@ void CSegmentView::ResetContents() {
     m_addedBlocks.clear();
     m_layout = CAlignmentLayout();
     m_colours = CSegmentColours();
+    m_blockColours.clear();
     Ctrl()->Relayout();
 }
 
@@ -42,8 +43,13 @@ void CSegmentView::BuildRows() {
         m_layout = project->Layout();
         m_colours.textColour = project->Params().TextColour();
         m_colours.linkedTextColour = project->Params().LinkedTextColour();
-        m_colours.blockColour = [project](int identifier) {
-            return project->BlockColourById(identifier);
+        m_blockColours.clear();
+        const CSimBlockSet& blocks = project->BlockSet();
+        for (int b = 0; b < blocks.BlockCount(); ++b)
+            m_blockColours.emplace(blocks.BlockAt(b)->Identifier(), blocks.BlockAt(b)->Colour());
+        m_colours.blockColour = [this](int identifier) {
+            auto it = m_blockColours.find(identifier);
+            return it == m_blockColours.end() ? kNoColour : it->second;
         };
         for (int i = 0; i < m_layout.RowCount(); ++i) {
             const CAlignmentLayout::Row& source = m_layout.RowAt(i);

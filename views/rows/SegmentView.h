@@ -5,6 +5,7 @@
 
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "layout/AlignmentLayout.h"
@@ -58,5 +59,7 @@ class CSegmentView : public CTilxView {
 
     CAlignmentLayout m_layout;
     CSegmentColours m_colours;
+    // Block colours by identifier, taken from the block set at every build.
+    std::unordered_map<int, std::uint32_t> m_blockColours;
     std::vector<int> m_addedBlocks;
 };

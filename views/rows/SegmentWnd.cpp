@@ -52,21 +52,26 @@ void CSegmentWnd::ClearColourSegments() {
     RefreshColours();
 }
 
-void CSegmentWnd::RefreshColours() {
-    m_runs = CColourRuns(m_colourSegments, m_colours.blockColour);
+const CColourRuns& CSegmentWnd::Runs() const {
+    if (m_runsStale) {
+        m_runs = CColourRuns(m_colourSegments, m_colours.blockColour);
+        m_runsStale = false;
+    }
+    return m_runs;
 }
 
 std::uint32_t CSegmentWnd::BackgroundAt(int column) const {
     if (column < 0 || column >= ColumnCount())
         return kNoColour;
+    const CColourRuns& runs = Runs();
     if (CharAt(column) != '-')
-        return m_runs.ColourAt(m_positions[column]);
+        return runs.ColourAt(m_positions[column]);
     // A gap column records the residue before it.
     const int after = m_positions[column] + 1;
     if (after <= 0)
         return kNoColour;
-    if (!m_runs.IsBoundary(after))
-        return m_runs.ColourAt(after);
+    if (!runs.IsBoundary(after))
+        return runs.ColourAt(after);
     return ColourAtColumn(m_segments, column, m_colourSegments, m_colours.blockColour);
 }
 

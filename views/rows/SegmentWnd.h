@@ -36,8 +36,8 @@ class CSegmentWnd : public CTextWnd {
     // Sets the range of a block (adding it when missing).
     void UpdateColourSegment(const CSimColorSegment& segment);
     void ClearColourSegments();
-    // Block colours changed: work the runs out again.
-    void RefreshColours();
+    // Block colours changed: the runs are worked out again when next needed.
+    void RefreshColours() { m_runsStale = true; }
 
     // The stored background colour of a column: its residue's ranges, or for a gap the ranges
     // holding the residues on both sides; kNoColour beyond the row.
@@ -48,10 +48,14 @@ class CSegmentWnd : public CTextWnd {
     CCellStyle CellStyle(int column, const CRowPaintContext& context) const override;
 
   private:
+    // The colour runs, worked out once after every change of the ranges.
+    const CColourRuns& Runs() const;
+
     std::string m_sequence;
     CSegmentRow m_segments;
     std::vector<std::int32_t> m_positions;
     std::vector<CSimColorSegment> m_colourSegments;
-    CColourRuns m_runs;
+    mutable CColourRuns m_runs;
+    mutable bool m_runsStale = false;
     const CSegmentColours& m_colours;
 };
