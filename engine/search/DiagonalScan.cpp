@@ -286,19 +286,31 @@ std::size_t CPlacementJoins::IndexOf(int a, int b, int offset) const {
 const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) {
     const std::size_t index = IndexOf(a, b, offset);
     std::atomic<std::uint8_t>& state = m_states[index];
-    std::uint8_t seen = state.load(std::memory_order_acquire);
-    if (seen == kMissing && state.compare_exchange_strong(seen, kWorking)) {
-        m_joins[index] = JoinOf(*m_sequences[a], *m_sequences[b], offset, m_grid, m_cutoff);
+    for (;;) {
+        std::uint8_t seen = state.load(std::memory_order_acquire);
+        if (seen == kReady)
+            return m_joins[index];
+        if (seen == kWorking) {
+            // Another worker is working it out (rarely: each takes a few microseconds).
+            state.wait(seen, std::memory_order_acquire);
+            continue;
+        }
+        if (!state.compare_exchange_strong(seen, kWorking))
+            continue;
+        try {
+            m_joins[index] = JoinOf(*m_sequences[a], *m_sequences[b], offset, m_grid, m_cutoff);
+        } catch (...) {
+            // Out of memory: the slot is free again, so that no worker waits for it forever.
+            state.store(kMissing, std::memory_order_release);
+            state.notify_all();
+            throw;
+        }
         m_heldBytes += m_joins[index].prefix.capacity() * sizeof(std::int64_t) +
                        m_joins[index].runs.capacity() * sizeof(CJoinedRun);
         state.store(kReady, std::memory_order_release);
         state.notify_all();
         return m_joins[index];
     }
-    // Another worker is working it out (rarely: each takes a few microseconds).
-    while ((seen = state.load(std::memory_order_acquire)) != kReady)
-        state.wait(seen, std::memory_order_acquire);
-    return m_joins[index];
 }
 
 bool ScanDiagonal(const CSimDiag& diagonal, int longest, int minSequences, CPlacementJoins& joins,

@@ -29,7 +29,8 @@ inline int WorkerCount(int requested) {
 // Calls task(i, worker) for every i on `threads` workers (worker = 0 .. threads - 1, so tasks
 // can keep per-worker state) and consume(i, result) on this thread for i = 0, 1, ... in order.
 // When consume returns false, tasks not yet started are skipped and the result is false. An
-// exception of a task is rethrown here when its result is due, after the results before it.
+// exception of a task is rethrown here when its result is due, after the results before it; one
+// of consume is rethrown once the workers have stopped.
 //
 // Workers take runs of consecutive tasks, a sixteenth of their share at a time: tasks of a few
 // microseconds would otherwise spend more time handing their results over than working.
@@ -97,14 +98,19 @@ bool RunInOrder(int threads, std::size_t count, const std::function<Result(std::
 
     bool completed = true;
     std::exception_ptr error;
-    for (std::size_t r = 0; r < runs && completed && !error; ++r) {
-        CSlot& slot = slots[r];
-        slot.ready.wait(false, std::memory_order_acquire);
-        for (std::size_t k = 0; k < slot.results.size() && completed; ++k)
-            completed = consume(r * run + k, slot.results[k]);
-        if (completed && slot.error)
-            error = slot.error;
-        slot.results.clear();
+    try {
+        for (std::size_t r = 0; r < runs && completed && !error; ++r) {
+            CSlot& slot = slots[r];
+            slot.ready.wait(false, std::memory_order_acquire);
+            for (std::size_t k = 0; k < slot.results.size() && completed; ++k)
+                completed = consume(r * run + k, slot.results[k]);
+            if (completed && slot.error)
+                error = slot.error;
+            slot.results.clear();
+        }
+    } catch (...) {
+        // A failing consume (out of memory) must not leave the workers running.
+        error = std::current_exception();
     }
     stop.store(true);
     // Runs already taken finish their current task; their results are dropped.

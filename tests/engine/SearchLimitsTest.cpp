@@ -313,7 +313,7 @@ TEST(SearchLimits, RefusedThreadsLeaveTheWorkToThoseStartedOrToTheCallingThread)
     }
 }
 
-TEST(SearchLimits, AStarterThatFailsOtherwiseEndsTheWorkWithItsError) {
+TEST(SearchLimits, OtherFailuresWhileWorkersRunEndTheWorkWithTheirError) {
     std::atomic<int> started{0};
     const CThreadStarter failing = [&](std::function<void()> work) {
         if (started.load() == 1)
@@ -327,6 +327,14 @@ TEST(SearchLimits, AStarterThatFailsOtherwiseEndsTheWorkWithItsError) {
     const std::function<bool(std::size_t, int&)> consume = [](std::size_t, int&) { return true; };
     // The started worker is joined before the error leaves (else the program would end).
     EXPECT_THROW(RunInOrder(4, 500, task, consume, failing), std::bad_alloc);
+
+    // So are the workers when taking a result fails.
+    const std::function<bool(std::size_t, int&)> failingConsume = [](std::size_t i, int&) {
+        if (i == 100)
+            throw std::bad_alloc();
+        return true;
+    };
+    EXPECT_THROW(RunInOrder(4, 500, task, failingConsume), std::bad_alloc);
 }
 
 TEST(SearchLimits, ASearchWhoseThreadsAreRefusedFindsTheSameResult) {
