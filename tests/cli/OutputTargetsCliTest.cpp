@@ -11,10 +11,10 @@
 #include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <sstream>
 #include <thread>
 
 #include "DeviceGuard.h"
+#include "archive/FileIO.h"
 #include "cli/CliRun.h"
 
 namespace fs = std::filesystem;
@@ -24,10 +24,8 @@ namespace {
 const std::string kMyoglobins = TB_TEST_DATA_DIR "/projects/myoglobins6.fa";
 
 std::string Contents(const fs::path& path) {
-    std::ifstream in(path, std::ios::binary);
-    std::ostringstream text;
-    text << in.rdbuf();
-    return text.str();
+    const std::vector<std::uint8_t> bytes = ReadWholeFile(path.string());
+    return std::string(bytes.begin(), bytes.end());
 }
 
 bool Mentions(const std::string& text, const std::string& part) {

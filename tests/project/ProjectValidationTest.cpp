@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <functional>
 #include <limits>
 #include <optional>
 #include <random>
@@ -237,26 +238,23 @@ TEST(ProjectValidation, LinksMustNameShownMoleculesWithinTheirResidues) {
 }
 
 TEST(ProjectValidation, MoleculesAndEntriesMustBeTellableApart) {
-    CProjectSpec sameName = Sound();
-    sameName.molecules[2].name = "alpha";
-    EXPECT_THAT(Refusal(sameName), Mentions("two molecules are named \"alpha\""));
-
-    CProjectSpec noName = Sound();
-    noName.molecules[1].name = "";
-    EXPECT_THAT(Refusal(noName), Mentions("molecule 2 has no name"));
-
-    CProjectSpec sameKey = Sound();
-    sameKey.molecules[2].key = "A1";
-    EXPECT_THAT(Refusal(sameKey), Mentions("two molecules share the key A1"));
-
-    CProjectSpec sameEntry = Sound();
-    sameEntry.entries[2].key = "B2";
-    EXPECT_THAT(Refusal(sameEntry), Mentions("two block entries name the molecule"));
-
-    // The alignment shows the molecule's residues where the entry's are counted.
-    CProjectSpec longer = Sound();
-    longer.entries[1].sequence += "kkkk";
-    EXPECT_THAT(Refusal(longer), Mentions("the block entry of \"beta\" differs in length"));
+    const std::vector<std::pair<std::function<void(CProjectSpec&)>, std::string>> cases = {
+        {[](CProjectSpec& spec) { spec.molecules[2].name = "alpha"; },
+         "two molecules are named \"alpha\""},
+        {[](CProjectSpec& spec) { spec.molecules[1].name = ""; }, "molecule 2 has no name"},
+        {[](CProjectSpec& spec) { spec.molecules[2].key = "A1"; },
+         "two molecules share the key A1"},
+        {[](CProjectSpec& spec) { spec.entries[2].key = "B2"; },
+         "two block entries name the molecule"},
+        // The alignment shows the molecule's residues where the entry's are counted.
+        {[](CProjectSpec& spec) { spec.entries[1].sequence += "kkkk"; },
+         "the block entry of \"beta\" differs in length"},
+    };
+    for (const auto& [damage, message] : cases) {
+        CProjectSpec spec = Sound();
+        damage(spec);
+        EXPECT_THAT(Refusal(spec), Mentions(message)) << message;
+    }
 }
 
 TEST(ProjectValidation, ExpectationLimitsMustBePositiveNumbers) {
