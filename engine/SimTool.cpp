@@ -326,7 +326,7 @@ bool CSimTool::ScanDiagonals(const CScoreGrid& grid, bool& cancelled) {
     BeginPhase("Scanning each diagonal for blocks...", 0, total, 1);
     const std::vector<const std::vector<std::uint8_t>*> sequences = EncodedSequences();
     const int longest = LongestSequenceLength();
-    CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets, m_heldBytes);
+    CPlacementJoins joins(sequences, grid, m_cutoff, m_pairOffsets);
     using CBlocks = std::vector<std::unique_ptr<CSimBlock>>;
     struct CScan {
         CBlocks made;

@@ -165,8 +165,8 @@ class CSimTool {
     std::atomic<std::size_t> m_foundHits{0};
     // Why the workers were told to stop, once one of them was.
     std::atomic<Failure> m_stopReason{kNoFailure};
-    // Held by the kept diagonals, the blocks made so far, the placement joins and the
-    // expansions' tables in use; read by the workers.
+    // Held by the kept diagonals, the blocks made so far and the expansions' tables in use;
+    // read by the workers.
     std::atomic<std::size_t> m_heldBytes{0};
     std::vector<CSimHit> m_hits;
     std::vector<CSimDiag> m_diagonals;

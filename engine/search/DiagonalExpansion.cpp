@@ -27,6 +27,12 @@ void ForEach(const std::vector<std::uint64_t>& set, Visit visit) {
     }
 }
 
+// Whether a loop over placements asks whether to abort at step `step`: every few steps, each
+// of which tests up to a few thousand placement pairs.
+bool IsCheckDue(std::size_t step) {
+    return step % 16 == 0;
+}
+
 // The order of the (member, offset) sequences of diagonals that grew from one hit.
 bool ComesBefore(const CSimDiag& a, const CSimDiag& b) {
     const std::size_t common = std::min(a.members.size(), b.members.size());
@@ -127,7 +133,7 @@ bool CDiagonalExpander::Joins(const CPlacement& a, const CPlacement& b) const {
 std::optional<bool> CDiagonalExpander::SomeExcludedJoinsEveryCandidate() const {
     const auto candidates = m_placements.begin() + m_candidateCount;
     for (auto excluded = candidates; excluded != m_placements.end(); ++excluded) {
-        if ((*m_shouldAbort)())
+        if (IsCheckDue(excluded - candidates) && (*m_shouldAbort)())
             return std::nullopt;
         if (std::all_of(m_placements.begin(), candidates,
                         [&](const CPlacement& candidate) { return Joins(*excluded, candidate); }))
@@ -140,7 +146,7 @@ bool CDiagonalExpander::BuildAdjacency() {
     const std::size_t count = m_placements.size();
     m_adjacency.assign(count * m_words, 0);
     for (std::size_t u = 0; u < count; ++u) {
-        if ((*m_shouldAbort)())
+        if (IsCheckDue(u) && (*m_shouldAbort)())
             return false;
         for (std::size_t v = u + 1; v < count; ++v) {
             if (!Joins(m_placements[u], m_placements[v]))

@@ -253,13 +253,8 @@ CPairJoin JoinOf(const std::vector<std::uint8_t>& a, const std::vector<std::uint
 
 CPlacementJoins::CPlacementJoins(
     const std::vector<const std::vector<std::uint8_t>*>& sequences, const CScoreGrid& grid,
-    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-    std::atomic<std::size_t>& heldBytes)
-    : m_sequences(sequences),
-      m_grid(grid),
-      m_cutoff(cutoff),
-      m_count(pairOffsets.size()),
-      m_heldBytes(heldBytes) {
+    int cutoff, const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets)
+    : m_sequences(sequences), m_grid(grid), m_cutoff(cutoff), m_count(pairOffsets.size()) {
     for (std::size_t a = 0; a < m_count; ++a) {
         for (std::size_t b = 0; b < m_count; ++b) {
             m_firstOfPair.push_back(m_offsets.size());
@@ -305,8 +300,6 @@ const CPairJoin& CPlacementJoins::Join(int a, int b, int offset) {
             state.notify_all();
             throw;
         }
-        m_heldBytes += m_joins[index].prefix.capacity() * sizeof(std::int64_t) +
-                       m_joins[index].runs.capacity() * sizeof(CJoinedRun);
         state.store(kReady, std::memory_order_release);
         state.notify_all();
         return m_joins[index];

@@ -50,12 +50,10 @@ struct CPairJoin {
 class CPlacementJoins {
   public:
     // `pairOffsets[a][b]` (a < b) lists the hit offsets of the pair in increasing order. The
-    // sequences and the grid must outlive this object. The approximate memory of each join
-    // worked out is added to `heldBytes`.
+    // sequences and the grid must outlive this object.
     CPlacementJoins(const std::vector<const std::vector<std::uint8_t>*>& sequences,
                     const CScoreGrid& grid, int cutoff,
-                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets,
-                    std::atomic<std::size_t>& heldBytes);
+                    const std::vector<std::vector<std::vector<std::int32_t>>>& pairOffsets);
 
     // Molecules a < b with residue p of a facing residue p + offset of b, where offset is one of
     // their hit offsets (std::logic_error otherwise).
@@ -75,7 +73,6 @@ class CPlacementJoins {
     std::vector<std::int32_t> m_offsets;
     std::vector<CPairJoin> m_joins;
     std::unique_ptr<std::atomic<std::uint8_t>[]> m_states;
-    std::atomic<std::size_t>& m_heldBytes;
 };
 
 // Appends the blocks of `diagonal` in the order they are made. `longest` is the length of the

@@ -139,10 +139,9 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     // Every pair placed at offset 0.
     std::vector<std::vector<std::vector<std::int32_t>>> offsets(
         3, std::vector<std::vector<std::int32_t>>(3, std::vector<std::int32_t>{0}));
-    std::atomic<std::size_t> heldBytes{0};
     const std::function<bool()> goOn = [] { return false; };
     for (int minimum : {2, 3}) {
-        CPlacementJoins joins(sequences, grid, 4, offsets, heldBytes);
+        CPlacementJoins joins(sequences, grid, 4, offsets);
         std::vector<CBlockCandidate> blocks;
         ASSERT_TRUE(ScanDiagonal(diagonal, 30, minimum, joins, goOn, blocks));
         ASSERT_EQ(blocks.size(), 1u) << minimum;
@@ -155,7 +154,7 @@ TEST(SimDiagonalScan, ThreeMembersJoinedOverOneStretchMakeOneBlock) {
     // Without the third member only the pair is joined: a block of two, or none with S = 3.
     const auto unrelated = Codes(std::string(30, 'X'));
     const std::vector<const std::vector<std::uint8_t>*> pairOnly{&first, &second, &unrelated};
-    CPlacementJoins joins(pairOnly, grid, 4, offsets, heldBytes);
+    CPlacementJoins joins(pairOnly, grid, 4, offsets);
     std::vector<CBlockCandidate> blocks;
     ASSERT_TRUE(ScanDiagonal(diagonal, 30, 3, joins, goOn, blocks));
     EXPECT_TRUE(blocks.empty());
