@@ -79,10 +79,12 @@ std::optional<int> CSegmentWnd::PositionNumber(int column) const {
     return m_segments.PositionNumber(column);
 }
 
-CCellStyle CSegmentWnd::CellStyle(int column, const CRowPaintContext& context) const {
-    const QColor windowText = context.palette->color(QPalette::Text);
+QColor CSegmentWnd::TextColourAt(int column, const CRowPaintContext& context) const {
     const std::uint32_t text =
         TextColourOf(CharAt(column), m_colours.textColour, m_colours.linkedTextColour);
-    return {StoredColour(text, windowText),
-            StoredColour(BackgroundAt(column), context.emptyBackground)};
+    return StoredColour(text, context.palette->color(QPalette::Text));
+}
+
+QColor CSegmentWnd::BackgroundAt(int column, const CRowPaintContext& context) const {
+    return StoredColour(BackgroundAt(column), context.emptyBackground);
 }

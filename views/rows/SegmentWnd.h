@@ -45,7 +45,8 @@ class CSegmentWnd : public CTextWnd {
     std::optional<int> PositionNumber(int column) const override;
 
   protected:
-    CCellStyle CellStyle(int column, const CRowPaintContext& context) const override;
+    QColor TextColourAt(int column, const CRowPaintContext& context) const override;
+    QColor BackgroundAt(int column, const CRowPaintContext& context) const override;
 
   private:
     // The colour runs, worked out once after every change of the ranges.

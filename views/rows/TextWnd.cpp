@@ -45,41 +45,68 @@ QString CTextWnd::TextInColumns(int first, int end) const {
     return QString::fromLatin1(m_text.data() + first, end - first);
 }
 
-CCellStyle CTextWnd::CellStyle(int, const CRowPaintContext& context) const {
-    return {context.palette->color(QPalette::Text), context.emptyBackground};
+QColor CTextWnd::TextColourAt(int, const CRowPaintContext& context) const {
+    return context.palette->color(QPalette::Text);
 }
+
+QColor CTextWnd::BackgroundAt(int, const CRowPaintContext& context) const {
+    return context.emptyBackground;
+}
+
+namespace {
+
+// Calls paint(first, end, value) for every run of columns in [first, end) whose valueOf is the
+// same.
+template <class ValueOf, class Paint>
+void ForEachRun(int first, int end, ValueOf valueOf, Paint paint) {
+    if (first >= end)
+        return;
+    auto value = valueOf(first);
+    for (int column = first + 1; column < end; ++column) {
+        auto next = valueOf(column);
+        if (next == value)
+            continue;
+        paint(first, column, value);
+        first = column;
+        value = next;
+    }
+    paint(first, end, value);
+}
+
+}  // namespace
 
 void CTextWnd::PaintCells(QPainter& painter, const CRowPaintContext& context) const {
+    const int first = std::max(context.firstColumn, 0);
     const int end = std::min(context.endColumn, ColumnCount());
-    if (context.axis.scale <= 0 || context.firstColumn >= end)
-        return;
-    painter.setFont(m_font);
-    const bool wholeRuns = !context.textPerCharacter && context.axis.scale == m_cellWidth;
-    int first = std::max(context.firstColumn, 0);
-    CCellStyle style = CellStyle(first, context);
-    for (int column = first + 1; column <= end; ++column) {
-        CCellStyle next;
-        if (column < end) {
-            next = CellStyle(column, context);
-            if (next == style)
-                continue;
-        }
-        PaintRun(painter, context, first, column, style, wholeRuns);
-        first = column;
-        style = next;
-    }
-}
-
-void CTextWnd::PaintRun(QPainter& painter, const CRowPaintContext& context, int first, int end,
-                        const CCellStyle& style, bool wholeRun) const {
     const double scale = context.axis.scale;
-    const double left = ColumnLeft(context.axis, first);
-    painter.fillRect(QRectF(left, context.top, (end - first) * scale, context.height),
-                     style.background);
+    if (scale <= 0 || first >= end)
+        return;
+    // Backgrounds first, then the text over them in runs of one colour: block colours change
+    // often along a row, text colours seldom.
+    ForEachRun(
+        first, end, [&](int column) { return BackgroundAt(column, context); },
+        [&](int from, int to, const QColor& background) {
+            const double left = ColumnLeft(context.axis, from);
+            painter.fillRect(QRectF(left, context.top, (to - from) * scale, context.height),
+                             background);
+        });
     // Characters squeezed below half their width are unreadable: colour only.
     if (scale * 2 < m_cellWidth)
         return;
-    painter.setPen(style.text);
+    painter.setFont(m_font);
+    const bool wholeRuns = !context.textPerCharacter && scale == m_cellWidth;
+    ForEachRun(
+        first, end, [&](int column) { return TextColourAt(column, context); },
+        [&](int from, int to, const QColor& text) {
+            painter.setPen(text);
+            PaintText(painter, context, from, to, wholeRuns);
+        });
+}
+
+void CTextWnd::PaintText(QPainter& painter, const CRowPaintContext& context, int first, int end,
+                         bool wholeRun) const {
+    const double scale = context.axis.scale;
+    const double left = ColumnLeft(context.axis, first);
     const double baseline = context.top + (context.height - m_textHeight) / 2.0 + m_ascent;
     if (wholeRun) {
         painter.drawText(QPointF(left, baseline),

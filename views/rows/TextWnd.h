@@ -7,13 +7,6 @@
 
 #include "rows/ScrollWnd.h"
 
-// The colours of one cell.
-struct CCellStyle {
-    QColor text;
-    QColor background;
-    bool operator==(const CCellStyle&) const = default;
-};
-
 class CTextWnd : public CScrollWnd {
   public:
     explicit CTextWnd(QString name, std::string text = {}, std::uint32_t ownerData = 0);
@@ -37,12 +30,14 @@ class CTextWnd : public CScrollWnd {
 
   protected:
     // The colours of a cell; by default the palette's text on the empty background.
-    virtual CCellStyle CellStyle(int column, const CRowPaintContext& context) const;
+    virtual QColor TextColourAt(int column, const CRowPaintContext& context) const;
+    virtual QColor BackgroundAt(int column, const CRowPaintContext& context) const;
 
   private:
-    // Draws columns [first, end) of one style.
-    void PaintRun(QPainter& painter, const CRowPaintContext& context, int first, int end,
-                  const CCellStyle& style, bool wholeRun) const;
+    // Draws the characters of columns [first, end) in the painter's pen: as one run, or one by
+    // one centred in their cells.
+    void PaintText(QPainter& painter, const CRowPaintContext& context, int first, int end,
+                   bool wholeRun) const;
 
     std::string m_text;
     QFont m_font;
