@@ -11,9 +11,8 @@
 #include <cstring>
 #include <filesystem>
 #include <fstream>
-#include <thread>
 
-#include "DeviceGuard.h"
+#include "SpecialFiles.h"
 #include "archive/FileIO.h"
 #include "cli/CliRun.h"
 
@@ -138,12 +137,10 @@ TEST_F(OutputTargetsCli, FifosAreWrittenInPlace) {
     const std::string fasta = FastaExport();
     const std::string fifo = Path("pipe");
     ASSERT_EQ(::mkfifo(fifo.c_str(), 0600), 0);
-    std::string received;
-    std::thread reader([&] { received = Contents(fifo); });
+    CFifoReader reader(fifo);
     const CRun run = RunTool({"export", "--format", "fasta", "-o", fifo, kMyoglobins});
-    reader.join();
+    EXPECT_EQ(reader.Take(), fasta);
     EXPECT_EQ(run.status, 0) << run.err;
-    EXPECT_EQ(received, fasta);
     EXPECT_TRUE(fs::is_fifo(fs::symlink_status(fifo)));
 }
 

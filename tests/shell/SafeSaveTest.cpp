@@ -8,8 +8,8 @@
 #include <cerrno>
 #include <cstring>
 
-#include "DeviceGuard.h"
 #include "SafeSave.h"
+#include "SpecialFiles.h"
 
 namespace {
 
