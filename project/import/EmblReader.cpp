@@ -103,6 +103,7 @@ int CEmblParser::Read() {
         if (StartsWith(line, "ID "))
             break;
     }
+    m_stream.MarkRecordStart();
     if (int result = ReadHeader(line))
         return result;
     ReadBody();
@@ -126,7 +127,10 @@ int CEmblParser::ReadHeader(const std::string& line) {
         return kNoName;
     std::replace(name.begin(), name.end(), '\\', ' ');
     m_mol.SetName(name);
-    if (int result = ApplyHeaderWords(m_mol, tokens))
+    // The header's pieces are separated by ';' as well as blanks: "PRT;153 AA." names PRT.
+    std::string words = line;
+    std::replace(words.begin(), words.end(), ';', ' ');
+    if (int result = ApplyHeaderWords(m_mol, SplitTokens(words)))
         return result;
     // EMBL: "ID   X56734; SV 1; linear; mRNA; STD; PLN; 1859 BP." or "ID   HSHBA1 standard;
     // DNA; HUM; 1000 BP.": the molecule type and the division are pieces between ';'.
@@ -175,10 +179,11 @@ void CEmblParser::ReadSequence() {
     while (m_stream.ReadLine(line)) {
         if (Contains(line, "//"))
             return;
-        for (const std::string& token : SplitTokens(line)) {
-            if (!StartsWithNonZeroNumber(token))
-                m_sequence += ToLower(token);
+        if (StartsWith(line, "ID   ")) {  // the next entry, without "//" before it
+            m_stream.UnreadLine();
+            return;
         }
+        AppendResidues(m_sequence, line);
     }
 }
 

@@ -23,6 +23,10 @@ std::string NameOfHeader(std::string_view line) {
     return name;
 }
 
+bool IsHeader(std::string_view line) {
+    return line.find('>') != std::string_view::npos;
+}
+
 }  // namespace
 
 int ReadFasta(CSxMol& molecule, CSxStream& stream) {
@@ -30,25 +34,24 @@ int ReadFasta(CSxMol& molecule, CSxStream& stream) {
     std::string line;
     bool found = false;
     while (stream.ReadLine(line)) {
-        if (line.find('>') != std::string::npos) {
+        if (IsHeader(line)) {
             found = true;
             break;
         }
     }
     if (!found)
         return kNoMoreRecords;
+    stream.MarkRecordStart();
     std::string name = NameOfHeader(line);
 
+    // The record runs to the next header; blank lines inside it separate nothing.
     std::string sequence;
-    while (stream.ReadLine(line) && !IsBlankLine(line)) {
-        if (line.find('>') != std::string::npos) {
-            stream.UnreadLine();  // the next record's header
+    while (stream.ReadLine(line)) {
+        if (IsHeader(line)) {
+            stream.UnreadLine();
             break;
         }
-        for (const std::string& token : SplitTokens(line)) {
-            if (!StartsWithNonZeroNumber(token))
-                sequence += ToLower(token);
-        }
+        AppendResidues(sequence, line);
     }
     if (sequence.empty())
         return kNoSequence;

@@ -100,6 +100,7 @@ int CGenBankParser::Read() {
         if (!tokens.empty() && tokens[0] == "LOCUS")
             break;
     }
+    m_stream.MarkRecordStart();
     if (int result = ReadLocus(tokens))
         return result;
     ReadBody();
@@ -164,11 +165,7 @@ void CGenBankParser::ReadSequence() {
             m_stream.UnreadLine();
             return;
         }
-        std::vector<std::string> tokens = SplitTokens(line);
-        std::size_t i = !tokens.empty() && StartsWithNonZeroNumber(tokens[0]) ? 1 : 0;
-        for (; i < tokens.size() && !StartsWithNonZeroNumber(tokens[i]); ++i) {
-            m_sequence += ToLower(tokens[i]);
-        }
+        AppendResidues(m_sequence, line);
     }
 }
 

@@ -24,7 +24,38 @@ std::string ImportResultMessage(int result, const std::string& fileName, int lin
     }
 }
 
-bool IsHardImportError(int result) {
-    return result == kProteinNotNucleic || result == kNucleicNotProtein ||
-           result == kIllegalCharacter;
+bool IsEndOfRecords(int result) {
+    return result == kNoMoreRecords || result == kFormatNotSupported;
+}
+
+std::string SkippedRecordMessage(int result, const std::string& fileName, int recordLine,
+                                 int problemLine) {
+    std::string reason = ImportResultMessage(result, fileName, problemLine);
+    // The suite-data message does not name the file by itself.
+    if (result == kBadSuiteData)
+        reason = "File " + fileName + ": " + reason;
+    return reason + " (the record at line " + std::to_string(recordLine) + " was skipped)";
+}
+
+void CSkippedRecords::Add(int result, int recordLine, int problemLine) {
+    if (++m_count <= kListed)
+        m_listed.push_back(SkippedRecordMessage(result, m_fileName, recordLine, problemLine));
+}
+
+std::string CSkippedRecords::Message(int moleculesRead) const {
+    if (m_count == 0)
+        return moleculesRead > 0 ? std::string() : ImportResultMessage(kNoSequence, m_fileName, 0);
+    std::string text;
+    for (const std::string& line : m_listed) {
+        if (!text.empty())
+            text += '\n';
+        text += line;
+    }
+    if (const std::size_t more = m_count - m_listed.size()) {
+        text += "\n... and " + std::to_string(more) + " more " +
+                (more == 1 ? "record of " + m_fileName + " was"
+                           : "records of " + m_fileName + " were") +
+                " skipped";
+    }
+    return text;
 }

@@ -106,8 +106,10 @@ CRecognition Recognise(CSxStream& stream) {
             }
         }
         if (!line.empty() && line[0] == '>') {
+            // The first record with residues decides; records without any are passed over.
             result.format = kFormatFasta;
-            result.type = TypeByContent(stream, {"//", ">"});
+            while (result.type == kTypeUnknown && !stream.AtEnd())
+                result.type = TypeByContent(stream, {"//", ">"});
             return result;
         }
         if (Contains(line, "ID   ")) {

@@ -32,6 +32,14 @@ bool StartsWithNonZeroNumber(std::string_view text) {
     return false;
 }
 
+void AppendResidues(std::string& sequence, std::string_view line) {
+    for (char c : line) {
+        const auto byte = static_cast<unsigned char>(c);
+        if (kWhitespace.find(c) == std::string_view::npos && !std::isdigit(byte))
+            sequence += static_cast<char>(std::tolower(byte));
+    }
+}
+
 bool IsBlankLine(std::string_view line) {
     return line.find_first_not_of(kWhitespace) == std::string_view::npos;
 }

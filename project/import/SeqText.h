@@ -10,6 +10,9 @@ std::vector<std::string> SplitTokens(std::string_view line);
 // The integer value the text starts with, as atoi reads it; only whether it is zero matters to
 // callers, so large values are not exact.
 bool StartsWithNonZeroNumber(std::string_view text);
+// Appends the residues of a sequence line, lower-cased: blanks, tabs, line ends and digits
+// (position numbers) are left out, every other character is kept.
+void AppendResidues(std::string& sequence, std::string_view line);
 // Only blanks, tabs, form feeds, CRs and LFs (or nothing).
 bool IsBlankLine(std::string_view line);
 std::string ToLower(std::string_view text);

@@ -50,10 +50,16 @@ int ReadSuiteText(CSxMol& molecule, CSxStream& stream) {
     while (stream.ReadLine(line)) {
         std::vector<std::string> fields = FieldsOf(line);
         int code = RecordCode(Trim(fields[0]));
+        if (started && (code == kEndOfFile || code == kMoleculeStart)) {
+            // The molecule lacks its end record: it ends where the next one (or the file) starts.
+            stream.UnreadLine();
+            break;
+        }
         if (code == kEndOfFile)
             return kNoMoreRecords;
         if (code == kMoleculeStart) {
             started = true;
+            stream.MarkRecordStart();
             molecule.SetName(Field(fields, 1));
         } else if (!started) {
             continue;
@@ -62,8 +68,7 @@ int ReadSuiteText(CSxMol& molecule, CSxStream& stream) {
         } else if (code == kAccession) {
             molecule.Description().accessions.push_back(Field(fields, 1));
         } else if (code == kSequencePiece) {
-            for (const std::string& token : SplitTokens(Field(fields, 1)))
-                sequence += ToLower(token);
+            AppendResidues(sequence, Field(fields, 1));
         } else if (code == kEndOfMolecule) {
             break;
         }

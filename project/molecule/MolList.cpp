@@ -76,15 +76,17 @@ bool CMolList::AddFile(const std::string& path, IUserPrompt& prompt) {
         names.push_back(molecule->Name());
     CUniqueNamer namer(names);
     CUrlCompanion companion(path);
+    CSkippedRecords skipped(FileNameOf(path));
+    int added = 0;
+    // Records are counted for the companion's URLs whether they are read or skipped.
     for (int index = 0;; ++index) {
         auto molecule = std::make_unique<CSxMolX>(m_type);
         int result = ReadMolecule(format, *molecule, stream);
+        if (IsEndOfRecords(result))
+            break;
         if (result != kReadOne) {
-            if (!IsHardImportError(result))
-                return true;
-            prompt.ShowMessage(ImportResultMessage(result, FileNameOf(path), stream.LineNumber()),
-                               MessageIcon::exclamation);
-            return false;
+            skipped.Add(result, stream.RecordLine(), stream.ProblemLine());
+            continue;
         }
         std::string base = BaseNameOf(path);
         if (format == kFormatRaw && !base.empty())
@@ -96,7 +98,11 @@ bool CMolList::AddFile(const std::string& path, IUserPrompt& prompt) {
         if (molecule->Modifier().name.empty())
             molecule->Modifier() = molecule->Creator();
         m_molecules.push_back(std::move(molecule));
+        ++added;
     }
+    if (const std::string message = skipped.Message(added); !message.empty())
+        prompt.ShowMessage(message, MessageIcon::exclamation);
+    return added > 0;
 }
 
 CSxMolX* CMolList::At(int index) const {
@@ -150,7 +156,7 @@ bool CMolList::Rename(const std::string& oldName, const std::string& newName, IU
 int CMolList::ClassifyFile(const std::string& path) {
     CSxStream stream("");
     try {
-        std::vector<std::uint8_t> bytes = ReadWholeFile(path);
+        std::vector<std::uint8_t> bytes = ReadWholeFile(path, kMaxSequenceFileBytes);
         if (CArchive::LeadingString(bytes) == "BlockProject")
             return kFileBlockProject;
         stream = CSxStream(std::string(bytes.begin(), bytes.end()));

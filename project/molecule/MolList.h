@@ -18,10 +18,11 @@ class CMolList : public CSerializable {
     CMolList& operator=(const CMolList&) = delete;
 
     // Imports every molecule of a sequence file: recognition, refusal of a file of the other
-    // molecule type, the raw-sequence question, unique names. Messages and the question go
-    // through `prompt`. False when the file was refused, the question cancelled, or a reader
-    // stopped with a hard error (molecules read before it stay). Throws CMolListException when
-    // the file cannot be read at all.
+    // molecule type, the raw-sequence question, unique names. A record that cannot be read is
+    // skipped and the rest are read; one message through `prompt` names the skipped records.
+    // False when the file was refused, the question cancelled, or no molecule was read from it.
+    // Throws CMolListException when the file cannot be read at all (or is beyond the size
+    // limit of sequence files).
     bool AddFile(const std::string& path, IUserPrompt& prompt);
 
     int MolType() const { return m_type; }

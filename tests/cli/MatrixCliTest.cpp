@@ -166,6 +166,23 @@ TEST(MatrixCli, UnknownNamesAndBadFilesExitWithStatusTwo) {
               std::string::npos);
 }
 
+TEST(MatrixCli, DamagedFilesAreRefusedNamingTheLine) {
+    TempDir dir;
+    const CRun show =
+        Matrix({"show", dir.File("short.mat", "# two letters\n  A  R\nA 4 -1\nR -1\n")});
+    EXPECT_EQ(show.status, kCliBadInput);
+    EXPECT_EQ(show.out, "");
+    EXPECT_NE(show.err.find("line 4: row R has 1 values, 2 expected"), std::string::npos);
+
+    // A matrix whose default cutoff would be 0 is no matrix to search with.
+    const std::string flat = dir.File("flat.mat", "  A  R\nA 0 -1\nR -1 0\n");
+    const std::string fasta = dir.File("g.fa", ">a\nAR\n>b\nAR\n");
+    const CRun search = RunTool({"search", "--quiet", "--matrix", flat, fasta});
+    EXPECT_EQ(search.status, kCliBadInput);
+    EXPECT_EQ(search.out, "");
+    EXPECT_NE(search.err.find("a cutoff must be at least 1"), std::string::npos);
+}
+
 TEST(MatrixCli, TheInstalledToolReportsThroughItsExitStatus) {
     FILE* pipe =
         popen((std::string(TB_CLI_PATH) + " matrix show blosum63mt 2>/dev/null").c_str(), "r");

@@ -77,7 +77,9 @@ TEST_F(MoleculeCli, RefusedAndBadFilesExitWithInputError) {
     std::string bad = Write("bad.seq", "MKV\nMKJ\n");
     CRun illegal = RunTool({"import", "--raw", "protein", bad});
     EXPECT_EQ(illegal.status, 2);
-    EXPECT_EQ(illegal.err, "Sequence File bad.seq: Contains Illegal Character(s) in Line 2\n");
+    EXPECT_EQ(illegal.err,
+              "Sequence File bad.seq: Contains Illegal Character(s) in Line 2 (the record at line "
+              "1 was skipped)\n");
 
     CRun missing = RunTool({"import", Path("none.fa")});
     EXPECT_EQ(missing.status, 2);
@@ -141,6 +143,69 @@ TEST_F(MoleculeCli, ExportChecksItsOptions) {
                        Fixture("genpept_globin.gp")})
                   .status,
               2);
+}
+
+// Two good records around a header without sequence (line 3) and a blank line inside one.
+const char* kDamagedFasta = ">a\nMKVL\n>lost\n>b\nWW\n\nLL\n";
+// Two GenPept entries without sequence, on lines 1 and 3.
+const char* kEmptyGenPept = "LOCUS  X 2 aa\n//\nLOCUS  Y 2 aa\n//\n";
+
+TEST_F(MoleculeCli, ImportTellsSkippedRecordsAndReadsTheRest) {
+    const std::string path = Write("d.fa", kDamagedFasta);
+    const CRun run = RunTool({"import", path});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out, "a\t4\nb\t4\n");
+    EXPECT_EQ(run.err, "File d.fa: No sequence data found (the record at line 3 was skipped)\n");
+}
+
+TEST_F(MoleculeCli, FileWithoutReadableRecordIsAnInputError) {
+    const std::string empty = Write("e.gp", kEmptyGenPept);
+    const CRun run = RunTool({"import", empty});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.err,
+              "File e.gp: No sequence data found (the record at line 1 was skipped)\n"
+              "File e.gp: No sequence data found (the record at line 3 was skipped)\n");
+
+    // Next to a good file the molecules of the good one are listed, and the status still
+    // says that one file gave nothing.
+    const CRun mixed = RunTool({"import", Write("good.fa", ">g\nMKV\n"), empty});
+    EXPECT_EQ(mixed.status, 2);
+    EXPECT_EQ(mixed.out, "g\t3\n");
+}
+
+TEST_F(MoleculeCli, ExportWritesNothingWithoutAReadableRecord) {
+    const std::string out = Write("out.fa", "previous contents\n");
+    const CRun refused =
+        RunTool({"export", "--format", "fasta", "-o", out, Write("e.gp", kEmptyGenPept)});
+    EXPECT_EQ(refused.status, 2);
+    EXPECT_EQ(Read(out), "previous contents\n");
+    const std::string fresh = Path("fresh.fa");
+    EXPECT_EQ(RunTool({"export", "--format", "fasta", "-o", fresh, Path("e.gp")}).status, 2);
+    EXPECT_FALSE(fs::exists(fresh));
+
+    // Damaged records are left out, with their message; the others are written.
+    const CRun partial =
+        RunTool({"export", "--format", "fasta", "-o", out, Write("d.fa", kDamagedFasta)});
+    EXPECT_EQ(partial.status, 0);
+    EXPECT_NE(partial.err.find("line 3 was skipped"), std::string::npos);
+    EXPECT_EQ(RunTool({"import", out}).out, "a\t4\nb\t4\n");
+}
+
+TEST_F(MoleculeCli, SearchRefusesAFileWithoutMolecules) {
+    const CRun run = RunTool({"search", "--quiet", Write("e.gp", kEmptyGenPept)});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.out, "");
+    EXPECT_NE(run.err.find("File e.gp: No sequence data found"), std::string::npos);
+}
+
+TEST_F(MoleculeCli, EndlessInputStopsAtTheSizeLimit) {
+    const CRun run = RunTool({"import", "/dev/zero"});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.out, "");
+    EXPECT_NE(run.err.find("/dev/zero: more than 1 GiB; sequence files are read up to 1 GiB"),
+              std::string::npos)
+        << run.err;
 }
 
 }  // namespace

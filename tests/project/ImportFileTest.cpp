@@ -150,28 +150,33 @@ TEST(ImportFile, RawQuestionForUnrecognisedFiles) {
     EXPECT_EQ(cancel.RawQuestions(), Strings{digits});
     EXPECT_EQ(list.MolType(), kTypeUnknown);
 
-    // Accepted: only digits give no sequence, which ends the file quietly.
+    // Accepted: only digits give a record without sequence, so nothing is read.
     CRecordingPrompt accept(kTypeNucleic);
-    EXPECT_TRUE(list.AddFile(digits, accept));
+    EXPECT_FALSE(list.AddFile(digits, accept));
     EXPECT_EQ(list.MolType(), kTypeNucleic);
     EXPECT_EQ(list.Count(), 0);
+    ASSERT_EQ(accept.Messages().size(), 1u);
+    EXPECT_EQ(accept.Messages()[0].text,
+              "File digits.txt: No sequence data found (the record at line 1 was skipped)");
 
     std::string blocks = dir.Write("blocks.seq", "acgt acgt\n\n\nggcc\n");
     EXPECT_TRUE(list.AddFile(blocks, accept));
     EXPECT_EQ(NamesOf(list), (Strings{"blocks", "blocks#2"}));
-    EXPECT_TRUE(accept.Messages().empty());
+    EXPECT_EQ(accept.Messages().size(), 1u);
 }
 
-TEST(ImportFile, HardErrorsKeepEarlierMoleculesAndShowTheirMessage) {
+TEST(ImportFile, DamagedRecordsAreSkippedWithOneMessage) {
     CScratchDir dir;
     CMolList protein(kTypeProtein);
     CRecordingPrompt prompt(kTypeProtein);
-    std::string raw = dir.Write("r.txt", "mkv\n\nwwl\nMKU\n");
-    EXPECT_FALSE(protein.AddFile(raw, prompt));
-    EXPECT_EQ(NamesOf(protein), Strings{"r"});
+    std::string raw = dir.Write("r.txt", "mkv\n\nwwl\nMKU\n\npp\n");
+    EXPECT_TRUE(protein.AddFile(raw, prompt));
+    EXPECT_EQ(NamesOf(protein), (Strings{"r", "r#2"}));
     ASSERT_EQ(prompt.Messages().size(), 1u);
     EXPECT_EQ(prompt.Messages()[0].text,
-              "Sequence File r.txt: Contains Illegal Character(s) in Line 4");
+              "Sequence File r.txt: Contains Illegal Character(s) in Line 4 (the record at line 3 "
+              "was skipped)");
+    EXPECT_EQ(prompt.Messages()[0].icon, MessageIcon::exclamation);
 
     // The header of the first entry says nothing; the second contradicts the list.
     std::string mixed =
@@ -180,29 +185,26 @@ TEST(ImportFile, HardErrorsKeepEarlierMoleculesAndShowTheirMessage) {
                   "LOCUS  B 4 aa\nORIGIN\n 1 mkvl\n//\nLOCUS  C\nORIGIN\n 1 gg\n//\n");
     CMolList nucleic;
     CRecordingPrompt quiet;
-    EXPECT_FALSE(nucleic.AddFile(mixed, quiet));
-    EXPECT_EQ(NamesOf(nucleic), Strings{"A"});
+    EXPECT_TRUE(nucleic.AddFile(mixed, quiet));
+    EXPECT_EQ(NamesOf(nucleic), (Strings{"A", "C"}));
     EXPECT_EQ(quiet.Messages().back().text,
-              "File mixed.gb: Protein file is indicated while DNA/RNA molecule file is expected");
+              "File mixed.gb: Protein file is indicated while DNA/RNA molecule file is expected "
+              "(the record at line 5 was skipped)");
 
-    std::string reverse = dir.Write("rev.gp", "LOCUS  A\nORIGIN\n 1 mkwl\n//\nLOCUS  B 4 bp\n");
-    EXPECT_FALSE(protein.AddFile(reverse, quiet));
-    EXPECT_EQ(quiet.Messages().back().text,
-              "File rev.gp: DNA/RNA molecule file is indicated while protein file is expected");
-}
-
-TEST(ImportFile, SoftEndingsAreSilentSuccesses) {
-    CScratchDir dir;
-    CRecordingPrompt prompt;
+    // No name, no sequence, damaged suite data: each record is skipped, the others read.
     CMolList list(kTypeProtein);
-    // No name, no sequence, damaged suite data: the file ends there, without a message.
-    EXPECT_TRUE(
-        list.AddFile(dir.Write("a.gp", "LOCUS  A 2 aa\nORIGIN\n 1 mk\n//\nLOCUS\n"), prompt));
-    EXPECT_TRUE(list.AddFile(dir.Write("b.fa", ">b\nMK\n>c\n>d\nWW\n"), prompt));
-    EXPECT_TRUE(
-        list.AddFile(dir.Write("c.sw", "ID   C  PRT;\nCC   @QRBO-DATA@ 1\nSQ\n MK\n//\n"), prompt));
-    EXPECT_EQ(NamesOf(list), (Strings{"A", "b"}));
-    EXPECT_TRUE(prompt.Messages().empty());
+    CRecordingPrompt told;
+    EXPECT_TRUE(list.AddFile(
+        dir.Write("a.gp", "LOCUS\nORIGIN\n 1 ww\n//\nLOCUS  A 2 aa\nORIGIN\n 1 mk\n//\n"), told));
+    EXPECT_TRUE(list.AddFile(
+        dir.Write("c.sw", "ID   C  PRT;\nCC   @QRBO-DATA@ 1\nSQ\n MK\n//\nID   D PRT;\nSQ\n W\n"),
+        told));
+    EXPECT_EQ(NamesOf(list), (Strings{"A", "D"}));
+    ASSERT_EQ(told.Messages().size(), 2u);
+    EXPECT_EQ(told.Messages()[0].text,
+              "File a.gp: No molecule name found (the record at line 1 was skipped)");
+    EXPECT_EQ(told.Messages()[1].text,
+              "File c.sw: Failed to read serialized QRBO data (the record at line 1 was skipped)");
 }
 
 TEST(ImportFile, CarriageReturnLinesReadLikeCrLf) {

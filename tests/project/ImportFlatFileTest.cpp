@@ -127,12 +127,12 @@ TEST(ImportGenBankReader, ResultCodes) {
     EXPECT_EQ(ReadText(kFormatGenBank, kKindProtein, "LOCUS  X  5 aa\nDEFINITION x.\n//\n"),
               kNoSequence);
     EXPECT_EQ(ReadText(kFormatGenBank, kKindProtein, "DEFINITION x.\n"), kNoMoreRecords);
-    // Sequence lines: the position is skipped, reading stops at the next number.
+    // Sequence lines: numbers and blanks are left out, wherever they stand.
     CSxMol molecule(kKindProtein);
     EXPECT_EQ(ReadText(kFormatGenBank, kKindProtein,
                        "LOCUS  X\\Y  5 aa\nORIGIN\n 1 mkv la 7 ww\n 9 GG\n", &molecule),
               kReadOne);
-    EXPECT_EQ(molecule.Sequence(), "mkvlagg");
+    EXPECT_EQ(molecule.Sequence(), "mkvlawwgg");
     EXPECT_EQ(molecule.Name(), "X Y");
 }
 
@@ -234,6 +234,9 @@ TEST(ImportEmblReader, ResultCodes) {
               kProteinNotNucleic);
     EXPECT_EQ(ReadText(kFormatEmbl, kKindProtein, "ID   X; SV 1; linear; DNA; 3 BP.\nSQ\n acg\n"),
               kNucleicNotProtein);
+    // A type word with no blank after its ';' counts as well.
+    EXPECT_EQ(ReadText(kFormatEmbl, kKindNucleic, "ID   X  STANDARD;PRT;3 AA.\nSQ\n MKV\n//\n"),
+              kProteinNotNucleic);
     EXPECT_EQ(ReadText(kFormatEmbl, kKindProtein, "ID   ;\nSQ\n MKV\n//\n"), kNoName);
     EXPECT_EQ(ReadText(kFormatEmbl, kKindProtein, "ID   X\nDE   y\n//\n"), kNoSequence);
     EXPECT_EQ(ReadText(kFormatEmbl, kKindProtein, "DE   y\n"), kNoMoreRecords);

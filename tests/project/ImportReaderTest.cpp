@@ -32,6 +32,8 @@ struct CReadResult {
     int result;
     CSxMol molecule;
     int line;
+    int recordLine;
+    int problemLine;
 };
 
 // Reads every record with one reader, as the import would.
@@ -41,7 +43,8 @@ std::vector<CReadResult> ReadAll(int format, int kind, const std::string& text) 
     for (;;) {
         CSxMol molecule(kind);
         int result = ReadMolecule(format, molecule, stream);
-        results.push_back({result, molecule, stream.LineNumber()});
+        results.push_back({result, molecule, stream.LineNumber(), stream.RecordLine(),
+                           stream.ProblemLine()});
         if (result != kReadOne || results.size() > 1000)
             return results;
     }
@@ -136,6 +139,9 @@ TEST(ImportRecognition, ContentTestLetsProteinWin) {
     CRecognition fasta = RecogniseText(">a\nacgt\n>b\nMKWL\n");
     EXPECT_EQ(fasta.format, kFormatFasta);
     EXPECT_EQ(fasta.type, kTypeNucleic);
+    // Records without residues are passed over; the first record with some decides.
+    EXPECT_EQ(RecogniseText(">a\n>b\n\n12\n>c\nMKWL\n>d\nacgt\n").type, kTypeProtein);
+    EXPECT_EQ(RecogniseText(">a\n\n>b\n").type, kTypeUnknown);
 }
 
 TEST(ImportFastaReader, ReadsRecordsAndNames) {
@@ -161,7 +167,10 @@ TEST(ImportFastaReader, ReadsRecordsAndNames) {
 TEST(ImportFastaReader, SoftEndings) {
     EXPECT_EQ(ReadAll(kFormatFasta, kKindProtein, "MKV\n")[0].result, kNoMoreRecords);
     EXPECT_EQ(ReadAll(kFormatFasta, kKindProtein, ">a\n>b\nMKV\n")[0].result, kNoSequence);
-    EXPECT_EQ(ReadAll(kFormatFasta, kKindProtein, ">a\n\nMKV\n")[0].result, kNoSequence);
+    // A blank line inside a record separates nothing.
+    std::vector<CReadResult> blank = ReadAll(kFormatFasta, kKindProtein, ">a\n\nMKV\n\nW\n");
+    EXPECT_EQ(blank[0].molecule.Sequence(), "mkvw");
+    EXPECT_EQ(blank[1].result, kNoMoreRecords);
 }
 
 TEST(ImportRawReader, DropsSkippedCharactersAndChecksTheAlphabet) {
@@ -171,12 +180,16 @@ TEST(ImportRawReader, DropsSkippedCharactersAndChecksTheAlphabet) {
     EXPECT_EQ(nucleic[0].molecule.Sequence(), "acguacgtnn");
     EXPECT_EQ(nucleic[0].molecule.Name(), "NONAME");
     EXPECT_EQ(nucleic[1].molecule.Sequence(), "ggcc");
-    EXPECT_EQ(nucleic[2].result, kNoSequence);
+    EXPECT_EQ(nucleic[2].result, kNoMoreRecords);
 
-    // 'u' is no amino-acid letter: result 8 with the number of the line holding it.
-    std::vector<CReadResult> protein = ReadAll(kFormatRaw, kKindProtein, "MKV\nLLA\nMKU\n");
+    // 'u' is no amino-acid letter: result 8 with the number of the line holding it, read to
+    // the end of its block so that the next block is the next record.
+    std::vector<CReadResult> protein =
+        ReadAll(kFormatRaw, kKindProtein, "\nMKV\nLLA\nMKU\nUU\n\nWW\n");
     EXPECT_EQ(protein[0].result, kIllegalCharacter);
-    EXPECT_EQ(protein[0].line, 3);
+    EXPECT_EQ(protein[0].recordLine, 2);
+    EXPECT_EQ(protein[0].problemLine, 4);
+    EXPECT_EQ(protein[0].line, 6);
     EXPECT_EQ(ReadAll(kFormatRaw, kKindProtein, "BZX*\n")[0].molecule.Sequence(), "bzx*");
     EXPECT_EQ(ReadAll(kFormatRaw, kKindNucleic, "ACGT\fA\n")[0].result, kIllegalCharacter);
     EXPECT_EQ(ReadAll(kFormatRaw, kKindProtein, "123 456\n")[0].result, kNoSequence);
