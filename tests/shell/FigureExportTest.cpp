@@ -16,6 +16,7 @@
 #include "QtPrinters.h"
 #include "print/FigureCommand.h"
 #include "print/FigureViews.h"
+#include "print/ProjectHolder.h"
 #include "project/ProjectFixtures.h"
 
 namespace {
@@ -110,17 +111,14 @@ class FigureExportTest : public ::testing::Test {
 };
 
 // The rows of the pane as it draws them for figures.
-struct CShownPane : IPaneDocument {
-    std::unique_ptr<CBlockProject> project;
+struct CShownPane {
+    CProjectHolder document;
     std::unique_ptr<CPaneView> pane = MakeFigurePane(QStringLiteral("alignment"));
 
-    explicit CShownPane(const QString& path)
-        : project(CBlockProject::Load(path.toStdString())) {
-        pane->SetDocument(this);
+    explicit CShownPane(const QString& path) : document(CBlockProject::Load(path.toStdString())) {
+        pane->SetDocument(&document);
         pane->OnUpdate(nullptr, kHintAll);
     }
-    CBlockProject* Project() const override { return project.get(); }
-    void SetModifiedFlag(bool) override {}
     const IPrintableRows& Rows() const { return *pane->PrintableRows(); }
 };
 

@@ -18,6 +18,7 @@
 #include "QuilterDoc.h"
 #include "Settings.h"
 #include "TcxMsgBox.h"
+#include "print/ProjectHolder.h"
 #include "print/RowsPrinter.h"
 
 namespace {
@@ -26,29 +27,23 @@ const QString kGlobins =
     QStringLiteral(TB_TEST_DATA_DIR "/../../resources/examples/globins.fa");
 
 // The globins searched, with the first block linked.
-class CGlobinsDocument : public IPaneDocument {
-  public:
-    CGlobinsDocument() {
-        CRecordingPrompt prompt;
-        EXPECT_TRUE(m_project.AddFile(kGlobins.toStdString(), prompt));
-        EXPECT_TRUE(m_project.Search(m_project.AllMolecules(), RunSearchJob, prompt));
-        const CSimBlockSet& blocks = m_project.BlockSet();
-        EXPECT_GT(blocks.BlockCount(), 0);
-        const CSimBlock& first = *blocks.BlockAt(0);
-        std::vector<ALN_BSEL_ENTRY> selection;
-        for (int member = 0; member < first.MemberCount(); ++member) {
-            const int start = first.Start(CSimBlock::kCurrent, member);
-            selection.push_back({blocks.MoleculeAt(first.Member(member))->Name(), start,
-                                 start + first.Width(CSimBlock::kCurrent)});
-        }
-        EXPECT_TRUE(m_project.Link(selection, prompt));
+std::unique_ptr<CBlockProject> LinkedGlobins() {
+    auto project = std::make_unique<CBlockProject>();
+    CRecordingPrompt prompt;
+    EXPECT_TRUE(project->AddFile(kGlobins.toStdString(), prompt));
+    EXPECT_TRUE(project->Search(project->AllMolecules(), RunSearchJob, prompt));
+    const CSimBlockSet& blocks = project->BlockSet();
+    EXPECT_GT(blocks.BlockCount(), 0);
+    const CSimBlock& first = *blocks.BlockAt(0);
+    std::vector<ALN_BSEL_ENTRY> selection;
+    for (int member = 0; member < first.MemberCount(); ++member) {
+        const int start = first.Start(CSimBlock::kCurrent, member);
+        selection.push_back({blocks.MoleculeAt(first.Member(member))->Name(), start,
+                             start + first.Width(CSimBlock::kCurrent)});
     }
-    CBlockProject* Project() const override { return &m_project; }
-    void SetModifiedFlag(bool) override {}
-
-  private:
-    mutable CBlockProject m_project;
-};
+    EXPECT_TRUE(project->Link(selection, prompt));
+    return project;
+}
 
 void Settle() {
     for (int i = 0; i < 3; ++i) {
@@ -60,7 +55,7 @@ void Settle() {
 }  // namespace
 
 TEST(PrintPane, GlobinsPrintTheirPredictedPages) {
-    CGlobinsDocument document;
+    CProjectHolder document(LinkedGlobins());
     CBlockAlnView pane;
     pane.SetDocument(&document);
     pane.OnUpdate(nullptr, kHintAll);

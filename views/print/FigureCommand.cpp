@@ -10,20 +10,9 @@
 #include "archive/Archive.h"
 #include "archive/FileIO.h"
 #include "print/FigureViews.h"
+#include "print/ProjectHolder.h"
 
 namespace {
-
-// The project a figure pane shows; figures change nothing.
-class CFigureDocument final : public IPaneDocument {
-  public:
-    explicit CFigureDocument(std::unique_ptr<CBlockProject> project)
-        : m_project(std::move(project)) {}
-    CBlockProject* Project() const override { return m_project.get(); }
-    void SetModifiedFlag(bool) override {}
-
-  private:
-    std::unique_ptr<CBlockProject> m_project;
-};
 
 bool ParsePositive(const QString& text, int& value) {
     bool ok = false;
@@ -159,7 +148,7 @@ int RunFigureCommand(const QStringList& arguments, QTextStream& err) {
         err << "tiler-blocks: " << error << "\n";
         return kFigureFailed;
     }
-    CFigureDocument document(std::move(project));
+    CProjectHolder document(std::move(project));
     int status = kFigureDone;
     for (const CFigureRequest& request : command.figures) {
         std::unique_ptr<CPaneView> pane = MakeFigurePane(request.view);
