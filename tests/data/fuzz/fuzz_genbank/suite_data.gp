@@ -1,0 +1,5 @@
+LOCUS       A  3 aa
+COMMENT     @QRBO-DATA@ 07FF
+ORIGIN
+ 1 mkv
+//
