@@ -182,6 +182,20 @@ TEST_F(AlnPaneTest, ShowingABlockSelectsItsColumnsAndScrollsOnlyWhenHidden) {
     EXPECT_EQ(Ctrl().FirstColumn(), ClampFirstColumn(1, 14, Ctrl().VisibleColumnCount()));
 }
 
+TEST_F(AlnPaneTest, ReceivedResiduesBecomeColumnsAndGoBackAsResidues) {
+    // Residues 2..5 of B stand at columns 2, 3, 6 and 7: the gap lies inside the range.
+    ASSERT_TRUE(m_pane.ShowReceivedSelection({"B", 2, 6}));
+    EXPECT_EQ(m_pane.SelectionEntries(), (Entries{{"B", 2, 8}}));
+    EXPECT_EQ(Ctrl().CurrentRow(), Row("B"));
+    const std::optional<CResidueSelection> sent = m_pane.SelectionForBroadcast();
+    ASSERT_TRUE(sent.has_value());
+    EXPECT_EQ(sent->molecule, "B");
+    EXPECT_EQ(sent->first, 2);
+    EXPECT_EQ(sent->last, 6);
+    EXPECT_FALSE(m_pane.ShowReceivedSelection({"missing", 1, 3}));
+    EXPECT_FALSE(m_pane.ShowReceivedSelection({"A", 4, 4})) << "an empty range";
+}
+
 class CRecordingMirror : public ISelectionMirror {
   public:
     void MirrorSelectionCompleted(const Entries& entries, bool scroll) override {
