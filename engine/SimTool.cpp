@@ -76,7 +76,8 @@ std::uint64_t CSimTool::EstimateSearchBytes(const std::vector<std::size_t>& leng
     }
     bytes += lengths.size() * (2 * longest + 1) * sizeof(std::uint64_t);  // the hit masks
     // Per worker, a running score per profile column and a mark per diagonal of a pair.
-    const std::uint64_t scratch = (RoundUpToProfile(longest) + 1) * sizeof(std::int16_t) + 2 * longest;
+    const std::uint64_t scratch =
+        (RoundUpToProfile(longest) + 1) * sizeof(std::int16_t) + 2 * longest;
     return bytes + static_cast<std::uint64_t>(std::max(workers, 1)) * scratch;
 }
 

@@ -52,8 +52,8 @@ class CSimTool {
         kTooManyDiagonals,     // the diagonals and blocks outgrew the memory budget
         kOutOfMemory,          // an allocation failed
         kCancelled,
-        kTooManyHits,          // the pairwise comparisons found more hits than the hit limit
-        kNotEnoughMemory,      // the molecules need more memory than the system has (refused)
+        kTooManyHits,      // the pairwise comparisons found more hits than the hit limit
+        kNotEnoughMemory,  // the molecules need more memory than the system has (refused)
     };
 
     // The message for a selection of `count` molecules that one search cannot hold; empty when

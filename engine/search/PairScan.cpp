@@ -84,8 +84,8 @@ CPairScanner::CPairScanner(const CScoreGrid& grid, int cutoff,
 bool CPairScanner::Scan(int a, int b, std::vector<std::int32_t>& offsets,
                         const CScanProgress& progress) const {
     offsets.clear();
-    const bool completed =
-        m_vectorised ? ScanVectorised(a, b, offsets, progress) : ScanScalar(a, b, offsets, progress);
+    const bool completed = m_vectorised ? ScanVectorised(a, b, offsets, progress)
+                                        : ScanScalar(a, b, offsets, progress);
     return completed && (!progress || progress(offsets.size()));
 }
 
@@ -94,8 +94,10 @@ bool CPairScanner::ScanScalar(int a, int b, std::vector<std::int32_t>& offsets,
     const auto& rows = *m_sequences[a];
     const auto& columns = *m_sequences[b];
     // Diagonals hold at most min(length a, length b) pairs each.
-    const std::size_t longestDiagonal = std::max<std::size_t>(1, std::min(rows.size(), columns.size()));
-    const int perCheck = static_cast<int>(std::max<std::size_t>(1, kPairsPerCheck / longestDiagonal));
+    const std::size_t longestDiagonal =
+        std::max<std::size_t>(1, std::min(rows.size(), columns.size()));
+    const int perCheck =
+        static_cast<int>(std::max<std::size_t>(1, kPairsPerCheck / longestDiagonal));
     const int endOffset = static_cast<int>(columns.size());
     for (int first = 1 - static_cast<int>(rows.size()); first < endOffset;) {
         const int end = endOffset - first > perCheck ? first + perCheck : endOffset;

@@ -57,7 +57,8 @@ class CLimitTool : public CSimTool {
     std::uint64_t AvailableMemory() override { return available; }
     std::thread StartWorker(std::function<void()> work) override {
         if (threadsAllowed >= 0 && started >= threadsAllowed)
-            throw std::system_error(std::make_error_code(std::errc::resource_unavailable_try_again));
+            throw std::system_error(
+                std::make_error_code(std::errc::resource_unavailable_try_again));
         ++started;
         return CSimTool::StartWorker(std::move(work));
     }
@@ -273,7 +274,8 @@ TEST(SearchLimits, ADiagonalsScanStopsBetweenItsMemberPairs) {
 CThreadStarter RefusingAfter(int allowed, std::atomic<int>& started) {
     return [allowed, &started](std::function<void()> work) {
         if (started.load() >= allowed)
-            throw std::system_error(std::make_error_code(std::errc::resource_unavailable_try_again));
+            throw std::system_error(
+                std::make_error_code(std::errc::resource_unavailable_try_again));
         ++started;
         return std::thread(std::move(work));
     };
@@ -334,9 +336,8 @@ TEST(SearchLimits, OtherFailuresWhileWorkersRunEndTheWorkWithTheirError) {
 
 TEST(SearchLimits, ASearchWhoseThreadsAreRefusedFindsTheSameResult) {
     const std::vector<std::string> family = {
-        "MKVLAAGIVGLLLAQRTEPWSHYCDFN", "MKVLSAGIVGLLLAQKTEPWSHYCDFN",
-        "PPMKVLAAGIVGLLLAQRTEPWAHYCD", "MKVLAAGIVGLMLAQRTEPWSHYCDFNGG",
-        "GGGMKVLAAGLVGLLLAQRTEPWSHY"};
+        "MKVLAAGIVGLLLAQRTEPWSHYCDFN", "MKVLSAGIVGLLLAQKTEPWSHYCDFN", "PPMKVLAAGIVGLLLAQRTEPWAHYCD",
+        "MKVLAAGIVGLMLAQRTEPWSHYCDFNGG", "GGGMKVLAAGLVGLLLAQRTEPWSHY"};
     CSearch alone(family, 33, 3);
     alone.tool->SetThreadCount(1);
     ASSERT_EQ(alone.tool->Run(), 1);
@@ -385,9 +386,9 @@ TEST(SearchLimits, MoleculesThatNeedMoreMemoryThanThereIsAreRefusedBeforeAnythin
     search.tool->available = 64 * kMb;
     EXPECT_EQ(search.tool->Run(), 0);
     EXPECT_EQ(search.tool->LastFailure(), CSimTool::kNotEnoughMemory);
-    const std::uint64_t needed = CSimTool::EstimateSearchBytes(
-        {long1.size(), long2.size()}, search.matrix.Size(),
-        CPairScanner::UsesProfiles(GridOf(search.matrix), 33), 2);
+    const std::uint64_t needed =
+        CSimTool::EstimateSearchBytes({long1.size(), long2.size()}, search.matrix.Size(),
+                                      CPairScanner::UsesProfiles(GridOf(search.matrix), 33), 2);
     EXPECT_EQ(search.tool->messages,
               std::vector<std::string>{CSimTool::NotEnoughMemoryMessage(needed, 64 * kMb)});
     EXPECT_TRUE(search.tool->phases.empty());
