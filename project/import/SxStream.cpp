@@ -1,37 +1,52 @@
 #include "import/SxStream.h"
 
 #include <fcntl.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <optional>
 
 namespace {
 
 constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
-// Reads up to `maxBytes` from the descriptor into `data`; true when the end was reached.
-bool ReadUpTo(int fd, std::size_t maxBytes, std::string& data, const std::string& path) {
-    constexpr std::size_t kChunk = std::size_t{1} << 20;
+// Reads the descriptor to its end, or none when it holds more than `maxBytes`. The data is
+// gathered in pieces and joined once complete, so that neither an endless input nor the
+// growth of one buffer takes much more memory than the limit.
+std::optional<std::string> ReadUpTo(int fd, std::size_t maxBytes, const std::string& path) {
+    constexpr std::size_t kPiece = std::size_t{1} << 20;
+    std::vector<std::string> pieces;
+    std::size_t total = 0;
     for (;;) {
-        // One byte beyond the limit tells a file of exactly the limit from a larger one.
-        const std::size_t room = maxBytes + 1 - data.size();
-        const std::size_t old = data.size();
-        data.resize(old + std::min(kChunk, room));
-        const ssize_t got = ::read(fd, data.data() + old, data.size() - old);
-        if (got < 0 && errno == EINTR) {
-            data.resize(old);
-            continue;
+        if (pieces.empty() || pieces.back().size() == kPiece) {
+            pieces.emplace_back();
+            pieces.back().reserve(kPiece);
         }
+        std::string& piece = pieces.back();
+        const std::size_t old = piece.size();
+        piece.resize(kPiece);
+        const ssize_t got = ::read(fd, piece.data() + old, kPiece - old);
+        piece.resize(old + static_cast<std::size_t>(std::max<ssize_t>(got, 0)));
+        if (got < 0 && errno == EINTR)
+            continue;
         if (got < 0)
             throw CFileException(path, std::strerror(errno));
-        data.resize(old + static_cast<std::size_t>(got));
         if (got == 0)
-            return true;
-        if (data.size() > maxBytes)
-            return false;
+            break;
+        total += static_cast<std::size_t>(got);
+        // One byte beyond the limit tells a file of exactly the limit from a larger one.
+        if (total > maxBytes)
+            return std::nullopt;
     }
+    std::string data;
+    data.reserve(total);
+    for (std::string& piece : pieces) {
+        data += piece;
+        std::string().swap(piece);
+    }
+    return data;
 }
 
 // "1 GiB" for the usual limit, the exact number of bytes for others.
@@ -52,25 +67,20 @@ CSxStream CSxStream::FromFile(const std::string& path, std::size_t maxBytes) {
     const int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
     if (fd < 0)
         throw CFileException(path, std::strerror(errno));
-    std::string data;
-    struct stat info {};
-    if (::fstat(fd, &info) == 0 && S_ISREG(info.st_mode) &&
-        static_cast<std::size_t>(info.st_size) <= maxBytes) {
-        data.reserve(static_cast<std::size_t>(info.st_size) + 1);
-    }
-    bool complete = false;
+    std::optional<std::string> data;
     try {
-        complete = ReadUpTo(fd, maxBytes, data, path);
+        data = ReadUpTo(fd, maxBytes, path);
     } catch (...) {
         ::close(fd);
         throw;
     }
     ::close(fd);
-    if (!complete)
+    if (!data) {
         throw CSequenceFileTooLarge(path, "more than " + SizeText(maxBytes) +
                                               "; sequence files are read up to " +
                                               SizeText(maxBytes));
-    return CSxStream(std::move(data));
+    }
+    return CSxStream(std::move(*data));
 }
 
 bool CSxStream::ReadLine(std::string& line) {
