@@ -204,7 +204,9 @@ void CEmblParser::Apply(const std::string& code, const std::vector<std::string>&
     } else if (code == "DT") {
         // The last date line is the latest change: "15-MAR-2017, entry version 1."
         std::string last = Trim(lines.back());
-        m_desc.dbDate = last.substr(0, last.find_first_of(", ("));
+        std::string date = last.substr(0, last.find_first_of(", ("));
+        if (IsDatabaseDate(date))
+            m_desc.dbDate = date;
     } else if (code == "KW") {
         m_desc.keywords = SplitList(StripTrailing(Joined(lines), '.'), ';');
     } else if (code == "OS") {

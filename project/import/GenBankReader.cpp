@@ -55,10 +55,6 @@ std::string FirstLineText(const std::string& line, const std::string& keyword) {
     return Trim(std::string_view(line).substr(keyword.size()));
 }
 
-bool IsDate(const std::string& token) {
-    return token.size() == 11 && token[2] == '-' && token[6] == '-';
-}
-
 bool IsDivision(const std::string& token) {
     return token.size() == 3 &&
            std::all_of(token.begin(), token.end(), [](char c) { return c >= 'A' && c <= 'Z'; });
@@ -125,7 +121,7 @@ int CGenBankParser::ReadLocus(const std::vector<std::string>& tokens) {
         return result;
     for (std::size_t i = 2; i < tokens.size(); ++i) {
         const std::string& word = tokens[i];
-        if (IsDate(word)) {
+        if (IsDatabaseDate(word)) {
             m_desc.dbDate = word;
         } else if (IsDivision(word)) {
             m_desc.division = word;

@@ -10,3 +10,6 @@
 // type gives kProteinNotNucleic or kNucleicNotProtein; "circular" clears the linear flag.
 // 0 when nothing contradicts.
 int ApplyHeaderWords(CSxMol& molecule, const std::vector<std::string>& tokens);
+
+// A database date as the headers write it: "15-MAR-2017" (two digits, a month, four digits).
+bool IsDatabaseDate(const std::string& token);

@@ -244,4 +244,21 @@ TEST(ImportEmblReader, ResultCodes) {
     EXPECT_EQ(ReadText(kFormatEmbl, kKindProtein, damaged), kBadSuiteData);
 }
 
+TEST(ImportEmblReader, DateLinesGiveOnlyDates) {
+    CSxMol molecule(kKindProtein);
+    ASSERT_EQ(
+        ReadText(kFormatEmbl, kKindProtein,
+                 "ID   X PRT;\nDT   01-FEB-1996 (Rel. 33)\nDT   21xx DNA; 4 BP.\nSQ\n MK\n//\n",
+                 &molecule),
+        kReadOne);
+    // The damaged last line is no date, and no header word of a file written from it.
+    EXPECT_EQ(molecule.Description().dbDate, "");
+    ASSERT_EQ(
+        ReadText(kFormatEmbl, kKindProtein,
+                 "ID   X PRT;\nDT   1-FEB-1996\nDT   01-FEB-1996, entry version 2.\nSQ\n MK\n",
+                 &molecule),
+        kReadOne);
+    EXPECT_EQ(molecule.Description().dbDate, "01-FEB-1996");
+}
+
 }  // namespace
