@@ -92,8 +92,11 @@ TEST(PrintPane, GlobinsPrintTheirPredictedPages) {
 
 class PrintCommandTest : public ::testing::Test {
   protected:
-    void SetUp() override {
+    static void ClearSettings() {
         QSettings(QSettings::IniFormat, QSettings::UserScope, "PELLAM, INC", "QRBO 10").clear();
+    }
+    void SetUp() override {
+        ClearSettings();
         CTcxMsgBox::SetTestHook([this](const QString& text, unsigned) {
             messages << text;
             return IDOK;
@@ -106,6 +109,8 @@ class PrintCommandTest : public ::testing::Test {
             app->ExitInstance();
         }
         CTcxMsgBox::SetTestHook(nullptr);
+        // Later tests expect the default page setup.
+        ClearSettings();
     }
     void Start(const QStringList& arguments) {
         app = std::make_unique<CQuilterApp>();
