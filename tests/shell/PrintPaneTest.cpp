@@ -3,7 +3,10 @@
 #include <gtest/gtest.h>
 
 #include <QApplication>
+#include <QPrintPreviewDialog>
+#include <QPrintPreviewWidget>
 #include <QPrinter>
+#include <QTimer>
 #include <QSettings>
 #include <QTemporaryDir>
 
@@ -158,4 +161,33 @@ TEST_F(PrintCommandTest, MarginsLargerThanThePageAreToldAndChangeNothing) {
     }
     EXPECT_EQ(app->Document().Project()->ToBytes(), before);
     EXPECT_EQ(app->Document().IsModified(), modified);
+}
+
+TEST_F(PrintCommandTest, PreviewShowsThePlannedPages) {
+    Start({kGlobins});
+    app->MainFrame()->ActivatePane(kAlnPane);
+    Settle();
+    // What the preview's printer will be asked to print, counted beforehand.
+    const CPageSetup page = app->Settings().LoadPageSetup();
+    const CRowsPrinter pages(*app->MainFrame()->Pane(kAlnPane)->PrintableRows(),
+                             PrintSetupFromStored(page.marginL, page.marginR, page.marginT,
+                                                  page.marginB, page.isMetric != 0, page.header,
+                                                  page.footer),
+                             {});
+    QString error;
+    const int expected = pages.PageCount(app->Printer(), error);
+    ASSERT_GT(expected, 0) << error.toStdString();
+
+    int shown = -1;
+    QTimer::singleShot(0, [&shown] {
+        for (QWidget* widget : QApplication::topLevelWidgets()) {
+            if (auto* dialog = qobject_cast<QPrintPreviewDialog*>(widget)) {
+                shown = dialog->findChild<QPrintPreviewWidget*>()->pageCount();
+                dialog->reject();
+            }
+        }
+    });
+    ASSERT_TRUE(app->Router().Run(ID_FILE_PRINT_PREVIEW));
+    EXPECT_EQ(shown, expected);
+    EXPECT_TRUE(messages.isEmpty()) << messages.join('|').toStdString();
 }
