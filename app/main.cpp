@@ -27,6 +27,7 @@ void PrintUsage() {
            "\n"
            "Options:\n"
            "  --help                show this text and exit\n"
+           "  --version             show the program's version and exit\n"
         << FigureUsage();
 }
 
@@ -36,6 +37,10 @@ int main(int argc, char** argv) {
     const QStringList arguments = ArgumentsOf(argc, argv);
     if (arguments.contains(QStringLiteral("--help")) || arguments.contains(QStringLiteral("-h"))) {
         PrintUsage();
+        return 0;
+    }
+    if (arguments.contains(QStringLiteral("--version"))) {
+        QTextStream(stdout) << "tiler-blocks " TB_VERSION "\n";
         return 0;
     }
     if (AsksForFigures(arguments)) {

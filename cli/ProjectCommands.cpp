@@ -28,7 +28,8 @@ std::unique_ptr<CBlockProject> LoadProject(const std::string& path) {
     } catch (const CFileException& e) {
         throw CCliError(kCliBadInput, e.what());
     } catch (const CArchiveException& e) {
-        throw CCliError(kCliBadInput, e.Report(path));
+        // The program's message and, beyond it, which part of the file is damaged.
+        throw CCliError(kCliBadInput, path + "\n" + e.what());
     }
     if (!project)
         throw CCliError(kCliBadInput, path + " is not a block project");
@@ -85,8 +86,8 @@ void ExportMsf(const CBlockProject& project, const std::string& path) {
     }
     try {
         msf.Save(path);
-    } catch (const CFileException&) {
-        throw CCliError(kCliBadInput, MsfWriteErrorMessage(path));
+    } catch (const CFileException& e) {
+        throw CCliError(kCliBadInput, MsfWriteErrorMessage(path) + "\n" + e.Reason());
     }
 }
 

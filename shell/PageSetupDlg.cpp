@@ -28,8 +28,9 @@ int CPageSetupDlg::Convert(int value, bool fromMetric, bool toMetric) {
 QString CPageSetupDlg::HeaderCodesLegend() {
     return QStringLiteral(
         "<small>Codes: <b>&amp;D</b> date, <b>&amp;T</b> time, <b>&amp;p</b> page number, "
-        "<b>&amp;s</b> file name. <b>&amp;l</b>, <b>&amp;c</b> and <b>&amp;r</b> place the text "
-        "before them at the left, centre or right.</small>");
+        "<b>&amp;P</b> page count, <b>&amp;s</b> file name, <b>&amp;f</b> file with its folder, "
+        "<b>&amp;&amp;</b> an &amp;. <b>&amp;l</b>, <b>&amp;c</b> and <b>&amp;r</b> place the "
+        "text before them at the left, centre or right.</small>");
 }
 
 CPageSetupDlg::CPageSetupDlg(const CPageSetup& setup, QWidget* parent)

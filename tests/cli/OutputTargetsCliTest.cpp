@@ -84,7 +84,9 @@ TEST_F(OutputTargetsCli, FullDevicesFailWithTheSystemsReason) {
         EXPECT_EQ(run.status, 2) << args[0];
         EXPECT_TRUE(Mentions(run.err, "/dev/full: " + noSpace)) << run.err;
     }
-    EXPECT_EQ(RunTool({"msf", project, "/dev/full"}).status, 2);
+    const CRun msf = RunTool({"msf", project, "/dev/full"});
+    EXPECT_EQ(msf.status, 2);
+    EXPECT_EQ(msf.err, "tiler-blocks-cli: Error opening '/dev/full' file\n" + noSpace + "\n");
     EXPECT_TRUE(full.Intact());
 }
 

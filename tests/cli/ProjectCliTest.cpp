@@ -328,7 +328,10 @@ TEST_F(ProjectCli, BadInputIsRefusedAndLeavesTheProjectFileAlone) {
     std::ofstream(Path("cut.bpr"), std::ios::binary) << before.substr(0, before.size() / 2);
     CRun run = RunTool({"info", Path("cut.bpr")});
     EXPECT_EQ(run.status, 2);
-    EXPECT_NE(run.err.find("Unexpected end of file."), std::string::npos) << run.err;
+    // The program's message, and beyond it which part of the file ended early.
+    EXPECT_EQ(run.err.rfind("tiler-blocks-cli: " + Path("cut.bpr") + "\nUnexpected end of file. (", 0),
+              0u)
+        << run.err;
     run = RunTool({"msf", Myoglobins(), Path("x.msf")});
     EXPECT_EQ(run.status, 2);
     EXPECT_EQ(run.err, "tiler-blocks-cli: " + Myoglobins() + " is not a block project\n");

@@ -23,6 +23,7 @@
 #include "SelectionBroadcast.h"
 #include "Settings.h"
 #include "TcxMsgBox.h"
+#include "print/HeaderFooter.h"
 
 namespace {
 
@@ -210,14 +211,20 @@ TEST(PageSetup, DefaultsConversionAndTheDialog) {
     EXPECT_EQ(result.marginT, metric ? 2000 : 1000);
     EXPECT_EQ(result.pageSizeX, metric ? 21000 : 8268);  // 210 mm
     EXPECT_EQ(result.footer, QStringLiteral("&p"));
-    // Every code of the default header and footer is explained beside the fields.
+    // Every code that printing understands is explained beside the fields.
     const auto* legend = dialog.findChild<QLabel*>("headerCodes");
     ASSERT_NE(legend, nullptr);
-    const QString codes = defaults.header + defaults.footer + QStringLiteral("&T&r");
-    for (qsizetype at = codes.indexOf('&'); at >= 0; at = codes.indexOf('&', at + 1)) {
-        const QString explained = QStringLiteral("<b>&amp;") + codes[at + 1] + QStringLiteral("</b>");
-        EXPECT_TRUE(legend->text().contains(explained)) << codes.mid(at, 2).toStdString();
+    const CPageTextContext page{QDateTime::currentDateTime(), "/data/p.bpr", 2, 3};
+    int understood = 0;
+    for (char code = ' '; code <= '~'; ++code) {
+        const QString written = QStringLiteral("&") + QChar(code);
+        if (ExpandHeaderFooter(written, page) == CPageTextParts{written, {}, {}})
+            continue;  // kept as written: not a code
+        ++understood;
+        const QString explained = "<b>&amp;" + written.mid(1).toHtmlEscaped() + "</b>";
+        EXPECT_TRUE(legend->text().contains(explained)) << written.toStdString();
     }
+    EXPECT_GE(understood, 9);
     EXPECT_EQ(dialog.Header()->toolTip(), legend->text());
     settings.SavePageSetup(result);
     EXPECT_EQ(settings.LoadPageSetup().marginT, result.marginT);
