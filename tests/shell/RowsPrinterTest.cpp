@@ -3,9 +3,12 @@
 #include <gtest/gtest.h>
 
 #include <QFile>
+#include <QFileInfo>
 #include <QPainter>
 #include <QPrinter>
 #include <QTemporaryDir>
+#include <cerrno>
+#include <cstring>
 #include <set>
 
 #include "PrintTestHelpers.h"
@@ -167,7 +170,25 @@ TEST(RowsPrinter, APrinterThatCannotBeOpenedIsReported) {
 
     error.clear();
     EXPECT_FALSE(WritePdf(missing, pdf.printer.pageLayout(), pages, error));
-    EXPECT_EQ(error, QString::fromLatin1(PrintMessages::kFileNotWritten).arg(missing));
+    EXPECT_EQ(error, QString::fromLatin1(PrintMessages::kFileNotWritten).arg(missing) + "\n" +
+                         QString::fromLocal8Bit(std::strerror(ENOENT)));
+}
+
+// Export to PDF saves as every file of the program does: through a link, which stays a link.
+TEST(RowsPrinter, PdfExportFollowsLinksAndReportsAFullDevice) {
+    QTemporaryDir dir;
+    const QString target = dir.filePath(QStringLiteral("figure.pdf"));
+    const QString link = dir.filePath(QStringLiteral("link.pdf"));
+    ASSERT_TRUE(QFile::link(target, link));
+    const CFakeRows rows(100, 4);
+    const CRowsPrinter pages(rows, A4Setup(20), Context());
+    PdfPrinter pdf(target);
+    QString error;
+    ASSERT_TRUE(WritePdf(link, pdf.printer.pageLayout(), pages, error)) << error.toStdString();
+    EXPECT_TRUE(QFileInfo(link).isSymLink());
+    QFile written(target);
+    ASSERT_TRUE(written.open(QIODevice::ReadOnly));
+    EXPECT_TRUE(written.read(5) == "%PDF-");
 }
 
 TEST(RowsPrinter, EmptyRowsHaveNothingToPrint) {

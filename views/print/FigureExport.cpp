@@ -1,16 +1,17 @@
 #include "print/FigureExport.h"
 
+#include <QBuffer>
 #include <QFileInfo>
 #include <QImage>
 #include <QPageSize>
 #include <QPainter>
 #include <QPdfWriter>
-#include <QSaveFile>
 #include <QSvgGenerator>
 #include <algorithm>
 #include <cmath>
 
 #include "print/PrintLayout.h"
+#include "SafeSave.h"
 
 namespace {
 
@@ -38,7 +39,7 @@ struct CFigure {
     }
 };
 
-bool WriteSvg(const CFigure& figure, QSaveFile& file, const QString& title) {
+bool WriteSvg(const CFigure& figure, QIODevice& file, const QString& title) {
     QSvgGenerator generator;
     generator.setOutputDevice(&file);
     generator.setSize(figure.scaled);
@@ -54,7 +55,7 @@ bool WriteSvg(const CFigure& figure, QSaveFile& file, const QString& title) {
     return painter.end();
 }
 
-bool WritePng(const CFigure& figure, QSaveFile& file, QString& error) {
+bool WritePng(const CFigure& figure, QIODevice& file, QString& error) {
     const QSize size = figure.scaled;
     if (size.width() > kMaxImageSide || size.height() > kMaxImageSide ||
         qint64(size.width()) * size.height() > kMaxImagePixels) {
@@ -80,7 +81,7 @@ bool WritePng(const CFigure& figure, QSaveFile& file, QString& error) {
     return image.save(&file, "PNG");
 }
 
-bool WritePdf(const CFigure& figure, QSaveFile& file, const QString& title) {
+bool WritePdf(const CFigure& figure, QIODevice& file, const QString& title) {
     QPdfWriter writer(&file);
     writer.setCreator(QStringLiteral("Tiler Blocks"));
     writer.setTitle(title);
@@ -149,26 +150,28 @@ int WriteFigure(const IPrintableRows& rows, const QString& path, const CFigureOp
                        std::max(1, int(std::lround(size.height() * scale))));
     const CFigure figure{rows, paint, first, end, size, scale, scaled};
 
-    QSaveFile file(path);
+    // Drawn in memory first, then saved as every file of the program is.
+    QBuffer file;
+    file.open(QIODevice::WriteOnly);
     const QString title = QFileInfo(path).completeBaseName();
-    bool written = file.open(QIODevice::WriteOnly);
-    if (written) {
-        switch (*format) {
-            case FigureFormat::svg:
-                written = WriteSvg(figure, file, title);
-                break;
-            case FigureFormat::png:
-                written = WritePng(figure, file, error);
-                break;
-            case FigureFormat::pdf:
-                written = WritePdf(figure, file, title);
-                break;
-        }
+    bool written = false;
+    switch (*format) {
+        case FigureFormat::svg:
+            written = WriteSvg(figure, file, title);
+            break;
+        case FigureFormat::png:
+            written = WritePng(figure, file, error);
+            break;
+        case FigureFormat::pdf:
+            written = WritePdf(figure, file, title);
+            break;
     }
-    if (!written || !file.commit()) {
-        file.cancelWriting();
+    QString reason;
+    if (!written || !SaveFileContents(path, file.data(), &reason)) {
         if (error.isEmpty()) {
             error = QStringLiteral("The file \"%1\" could not be written.").arg(path);
+            if (!reason.isEmpty())
+                error += QLatin1Char('\n') + reason;
         }
         return kFigureFailed;
     }

@@ -1,15 +1,16 @@
 #include "print/PrintCommands.h"
 
 #include <QAbstractPrintDialog>
+#include <QBuffer>
 #include <QFileDialog>
 #include <QFileInfo>
 #include <QPdfWriter>
 #include <QPrintDialog>
 #include <QPrintPreviewDialog>
 #include <QPrinter>
-#include <QSaveFile>
 
 #include "CommandIds.h"
+#include "SafeSave.h"
 
 namespace {
 
@@ -68,23 +69,23 @@ bool CanPrint(const IPrintableRows* rows) {
 
 bool WritePdf(const QString& path, const QPageLayout& layout, const CRowsPrinter& printer,
               QString& error) {
-    QSaveFile file(path);
-    if (!file.open(QIODevice::WriteOnly)) {
-        error = QString::fromLatin1(PrintMessages::kFileNotWritten).arg(path);
-        return false;
-    }
+    // Printed in memory first, then saved as every file of the program is.
+    QBuffer file;
+    file.open(QIODevice::WriteOnly);
     {
         QPdfWriter writer(&file);
         writer.setCreator(QStringLiteral("Tiler Blocks"));
         writer.setTitle(QFileInfo(path).completeBaseName());
         writer.setPageLayout(layout);
         if (!printer.Print(writer, error)) {
-            file.cancelWriting();
             return false;
         }
     }
-    if (!file.commit()) {
+    QString reason;
+    if (!SaveFileContents(path, file.data(), &reason)) {
         error = QString::fromLatin1(PrintMessages::kFileNotWritten).arg(path);
+        if (!reason.isEmpty())
+            error += QLatin1Char('\n') + reason;
         return false;
     }
     return true;
