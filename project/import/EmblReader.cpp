@@ -137,7 +137,10 @@ int CEmblParser::ReadHeader(const std::string& line) {
     // SWISS-PROT headers name neither.
     if (m_mol.Kind() != kKindNucleic)
         return 0;
-    for (const std::string& piece : SplitList(TextOf(line), ';')) {
+    // The first piece holds the name, whatever it reads like.
+    const std::vector<std::string> pieces = SplitList(TextOf(line), ';');
+    for (std::size_t i = 1; i < pieces.size(); ++i) {
+        const std::string& piece = pieces[i];
         if (m_desc.moleculeType.empty() && (Contains(piece, "DNA") || Contains(piece, "RNA")))
             m_desc.moleculeType = piece;
         if (IsDivision(piece))

@@ -234,6 +234,13 @@ TEST(ImportEmblReader, ResultCodes) {
               kProteinNotNucleic);
     EXPECT_EQ(ReadText(kFormatEmbl, kKindProtein, "ID   X; SV 1; linear; DNA; 3 BP.\nSQ\n acg\n"),
               kNucleicNotProtein);
+    // A name that reads like a division or a type word is only a name.
+    CSxMol named(kKindNucleic);
+    ASSERT_EQ(ReadText(kFormatEmbl, kKindNucleic,
+                       "ID   PRT; SV 1; linear; DNA; STD; SYN; 4 BP.\nSQ\n acgt\n//\n", &named),
+              kReadOne);
+    EXPECT_EQ(named.Name(), "PRT");
+    EXPECT_EQ(named.Description().division, "SYN");
     // A type word with no blank after its ';' counts as well.
     EXPECT_EQ(ReadText(kFormatEmbl, kKindNucleic, "ID   X  STANDARD;PRT;3 AA.\nSQ\n MKV\n//\n"),
               kProteinNotNucleic);
