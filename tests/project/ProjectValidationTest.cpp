@@ -26,9 +26,9 @@ struct CBlockSpec {
     std::vector<std::int32_t> starts;
     int width = 0;
     // The current layout; empty means the same as the original one.
-    std::vector<std::int32_t> currentStarts;
-    std::optional<int> currentWidth;
-    std::vector<int> excluded;  // member indices the current layout leaves out
+    std::vector<std::int32_t> currentStarts{};
+    std::optional<int> currentWidth{};
+    std::vector<int> excluded{};  // member indices the current layout leaves out
 };
 
 struct CStretchSpec {
