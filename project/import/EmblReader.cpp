@@ -7,6 +7,7 @@
 #include "import/HeaderWords.h"
 #include "import/ImportResult.h"
 #include "import/Readers.h"
+#include "import/Recognise.h"
 #include "import/SeqText.h"
 #include "import/SuiteData.h"
 
@@ -41,6 +42,18 @@ bool IsDivision(const std::string& piece) {
            std::all_of(piece.begin(), piece.end(), [](char c) { return c >= 'A' && c <= 'Z'; }) &&
            std::find(std::begin(kDataClasses), std::end(kDataClasses), piece) ==
                std::end(kDataClasses);
+}
+
+// "genomic DNA", "mRNA": printable words naming a nucleic acid and none naming a protein, so
+// that the writers can put it back into a header.
+bool IsMoleculeType(const std::string& piece) {
+    const bool printable =
+        std::all_of(piece.begin(), piece.end(), [](char c) { return c >= ' ' && c <= '~'; });
+    const std::vector<std::string> words = SplitTokens(piece);
+    return printable && (Contains(piece, "DNA") || Contains(piece, "RNA")) &&
+           std::none_of(words.begin(), words.end(), [](const std::string& word) {
+               return TypeOfHeaderWord(word) == kTypeProtein;
+           });
 }
 
 // "PubMed=6452630; DOI=...;" or the older "MEDLINE; 80137531." lines.
@@ -141,7 +154,7 @@ int CEmblParser::ReadHeader(const std::string& line) {
     const std::vector<std::string> pieces = SplitList(TextOf(line), ';');
     for (std::size_t i = 1; i < pieces.size(); ++i) {
         const std::string& piece = pieces[i];
-        if (m_desc.moleculeType.empty() && (Contains(piece, "DNA") || Contains(piece, "RNA")))
+        if (m_desc.moleculeType.empty() && IsMoleculeType(piece))
             m_desc.moleculeType = piece;
         if (IsDivision(piece))
             m_desc.division = piece;

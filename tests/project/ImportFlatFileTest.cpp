@@ -241,6 +241,13 @@ TEST(ImportEmblReader, ResultCodes) {
               kReadOne);
     EXPECT_EQ(named.Name(), "PRT");
     EXPECT_EQ(named.Description().division, "SYN");
+    // A piece with control characters is no molecule type: a writer would cut it short.
+    ASSERT_EQ(ReadText(kFormatEmbl, kKindNucleic,
+                       "ID   X; SV 1; DNA\x01"
+                       "zz; STD; SYN; 4 BP.\nSQ\n acgt\n//\n",
+                       &named),
+              kReadOne);
+    EXPECT_EQ(named.Description().moleculeType, "");
     // A type word with no blank after its ';' counts as well.
     EXPECT_EQ(ReadText(kFormatEmbl, kKindNucleic, "ID   X  STANDARD;PRT;3 AA.\nSQ\n MKV\n//\n"),
               kProteinNotNucleic);
