@@ -18,8 +18,7 @@ QAction* AddAction(QToolBar* bar, const QString& text, QKeySequence::StandardKey
     QAction* action = bar->addAction(text);
     action->setShortcut(key);
     action->setToolTip(text + QStringLiteral(" (") +
-                       QKeySequence(key).toString(QKeySequence::NativeText) +
-                       QStringLiteral(")"));
+                       QKeySequence(key).toString(QKeySequence::NativeText) + QStringLiteral(")"));
     return action;
 }
 
@@ -55,7 +54,8 @@ CHelpWindow::CHelpWindow(const QString& manualDir)
     bar->addWidget(m_findField);
     QAction* previous = AddAction(bar, QStringLiteral("Previous"), QKeySequence::FindPrevious);
     QAction* next = AddAction(bar, QStringLiteral("Next"), QKeySequence::FindNext);
-    connect(m_findField, &QLineEdit::returnPressed, this, [this] { FindText(m_findField->text()); });
+    connect(m_findField, &QLineEdit::returnPressed, this,
+            [this] { FindText(m_findField->text()); });
     connect(m_findField, &QLineEdit::textChanged, this, [this] { ShowFindResult(true); });
     connect(next, &QAction::triggered, this, [this] { FindText(m_findField->text()); });
     connect(previous, &QAction::triggered, this, [this] { FindText(m_findField->text(), true); });

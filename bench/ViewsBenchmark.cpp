@@ -128,7 +128,8 @@ struct CBenchPane {
     void Build(int coloured) {
         pane.OnUpdate(nullptr, kHintAll);
         const CSimBlockSet& blocks = document.Project()->BlockSet();
-        const int count = coloured < 0 ? blocks.BlockCount() : std::min(coloured, blocks.BlockCount());
+        const int count =
+            coloured < 0 ? blocks.BlockCount() : std::min(coloured, blocks.BlockCount());
         for (int i = 0; i < count; ++i) {
             pane.ShowBlockSelected(*blocks.BlockAt(i), true, false);
         }

@@ -120,12 +120,12 @@ CRowRange ParseRowRange(const std::string& text, const std::string& command,
         if (used != text.size() - dash - 1)
             throw std::invalid_argument(text);
     } catch (const std::exception&) {
-        throw CCliError(kCliBadInput, option + " wants NAME:FIRST-LAST, not '" + text + "'" +
-                                          UsageHint(command));
+        throw CCliError(kCliBadInput,
+                        option + " wants NAME:FIRST-LAST, not '" + text + "'" + UsageHint(command));
     }
     if (first < 1 || last < 1) {
-        throw CCliError(kCliBadInput,
-                        option + " counts from 1, not from 0, in '" + text + "'" + UsageHint(command));
+        throw CCliError(kCliBadInput, option + " counts from 1, not from 0, in '" + text + "'" +
+                                          UsageHint(command));
     }
     return {text.substr(0, colon), first, last};
 }
@@ -167,8 +167,7 @@ std::vector<ALN_BSEL_ENTRY> SelectionOf(const CSelectionOptions& options,
                                         const CAlignmentLayout& layout) {
     std::vector<ALN_BSEL_ENTRY> selection;
     for (const std::string& row : options.rows)
-        selection.push_back(
-            ResidueRowEntry(layout, ParseRowRange(row, options.command, "--rows")));
+        selection.push_back(ResidueRowEntry(layout, ParseRowRange(row, options.command, "--rows")));
     for (const std::string& row : options.columns)
         selection.push_back(
             ColumnRowEntry(layout, ParseRowRange(row, options.command, "--columns")));
@@ -177,8 +176,8 @@ std::vector<ALN_BSEL_ENTRY> SelectionOf(const CSelectionOptions& options,
 }
 
 // Each linked stretch as the residues --rows takes, then the display columns it now holds.
-void PrintLinkedStretches(const CBlockProject& project,
-                          const std::vector<ALN_BSEL_ENTRY>& columns, std::ostream& out) {
+void PrintLinkedStretches(const CBlockProject& project, const std::vector<ALN_BSEL_ENTRY>& columns,
+                          std::ostream& out) {
     const CAlignmentLayout layout = project.Layout();
     for (const ALN_BSEL_ENTRY& entry : columns) {
         const CSegmentRow& segments = layout.RowAt(layout.IndexOfRow(entry.name)).segments;

@@ -168,8 +168,9 @@ TEST_F(ProjectCli, LinkTheFirstTwoBlocksFromTheTableThenExportMsf) {
         run = RunTool({"link", path, "--rows", rows});
         if (run.status != 0) {
             ASSERT_GT(linked, 0) << run.err;
-            EXPECT_EQ(run.err, "tiler-blocks-cli: Block can not be linked.\n"
-                               "tiler-blocks-cli: nothing linked\n");
+            EXPECT_EQ(run.err,
+                      "tiler-blocks-cli: Block can not be linked.\n"
+                      "tiler-blocks-cli: nothing linked\n");
             EXPECT_EQ(ReadText(path), before);
             continue;
         }
@@ -179,8 +180,8 @@ TEST_F(ProjectCli, LinkTheFirstTwoBlocksFromTheTableThenExportMsf) {
             const std::vector<std::string> fields = Split(stretch, '\t');
             ASSERT_EQ(fields.size(), 2u) << stretch;
             printed.push_back(fields[0]);
-            shifted = shifted || (linked == 2 && fields[0].substr(fields[0].rfind(':') + 1) !=
-                                                     fields[1]);
+            shifted =
+                shifted || (linked == 2 && fields[0].substr(fields[0].rfind(':') + 1) != fields[1]);
         }
         std::vector<std::string> asked = Split(rows, ',');
         std::sort(printed.begin(), printed.end());
@@ -329,8 +330,9 @@ TEST_F(ProjectCli, BadInputIsRefusedAndLeavesTheProjectFileAlone) {
     CRun run = RunTool({"info", Path("cut.bpr")});
     EXPECT_EQ(run.status, 2);
     // The program's message, and beyond it which part of the file ended early.
-    EXPECT_EQ(run.err.rfind("tiler-blocks-cli: " + Path("cut.bpr") + "\nUnexpected end of file. (", 0),
-              0u)
+    EXPECT_EQ(
+        run.err.rfind("tiler-blocks-cli: " + Path("cut.bpr") + "\nUnexpected end of file. (", 0),
+        0u)
         << run.err;
     run = RunTool({"msf", Myoglobins(), Path("x.msf")});
     EXPECT_EQ(run.status, 2);

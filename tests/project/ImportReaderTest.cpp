@@ -43,8 +43,8 @@ std::vector<CReadResult> ReadAll(int format, int kind, const std::string& text) 
     for (;;) {
         CSxMol molecule(kind);
         int result = ReadMolecule(format, molecule, stream);
-        results.push_back({result, molecule, stream.LineNumber(), stream.RecordLine(),
-                           stream.ProblemLine()});
+        results.push_back(
+            {result, molecule, stream.LineNumber(), stream.RecordLine(), stream.ProblemLine()});
         if (result != kReadOne || results.size() > 1000)
             return results;
     }

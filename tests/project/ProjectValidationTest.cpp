@@ -15,13 +15,13 @@
 
 namespace {
 
-struct CMoleculeSpec {
+struct CMoleculeFields {
     std::string name;
     std::string key;
     std::string sequence;
 };
 
-struct CBlockSpec {
+struct CBlockFields {
     std::vector<std::int32_t> members;
     std::vector<std::int32_t> starts;
     int width = 0;
@@ -31,18 +31,18 @@ struct CBlockSpec {
     std::vector<int> excluded{};  // member indices the current layout leaves out
 };
 
-struct CStretchSpec {
+struct CStretchFields {
     int molecule;
     int position;
     int length;
 };
 
 // What a project file holds, each part as given.
-struct CProjectSpec {
-    std::vector<CMoleculeSpec> molecules;
-    std::vector<CMoleculeSpec> entries;
-    std::vector<CBlockSpec> blocks;
-    std::vector<std::vector<CStretchSpec>> links;
+struct CProjectFields {
+    std::vector<CMoleculeFields> molecules;
+    std::vector<CMoleculeFields> entries;
+    std::vector<CBlockFields> blocks;
+    std::vector<std::vector<CStretchFields>> links;
     double expectationLimit = 0.0001;
 };
 
@@ -51,10 +51,10 @@ class CRawMolecule : public CSerializable {
   public:
     static constexpr const char* kClassTag = "SxMolX";
     const char* ClassTag() const override { return kClassTag; }
-    explicit CRawMolecule(const CMoleculeSpec& spec) : m_key(spec.key) {
+    explicit CRawMolecule(const CMoleculeFields& fields) : m_key(fields.key) {
         m_molecule.SetKind(kKindProtein);
-        m_molecule.SetName(spec.name);
-        m_molecule.SetSequence(spec.sequence);
+        m_molecule.SetName(fields.name);
+        m_molecule.SetSequence(fields.sequence);
     }
     void Serialize(CArchive& ar) override {
         ar.XData(m_molecule);
@@ -91,17 +91,18 @@ class CRawProject : public CSerializable {
   public:
     static constexpr const char* kClassTag = CBlockProject::kClassTag;
     const char* ClassTag() const override { return kClassTag; }
-    explicit CRawProject(const CProjectSpec& spec) : m_molecules(std::make_unique<CRawMolList>()) {
-        m_params.SetExpectationLimit(spec.expectationLimit);
-        for (const CMoleculeSpec& molecule : spec.molecules)
+    explicit CRawProject(const CProjectFields& fields)
+        : m_molecules(std::make_unique<CRawMolList>()) {
+        m_params.SetExpectationLimit(fields.expectationLimit);
+        for (const CMoleculeFields& molecule : fields.molecules)
             m_molecules->molecules.push_back(std::make_unique<CRawMolecule>(molecule));
-        for (const CMoleculeSpec& entry : spec.entries)
+        for (const CMoleculeFields& entry : fields.entries)
             m_blockSet.AddMolecule(CSxMolEntry(entry.key, entry.name, entry.sequence));
-        for (const CBlockSpec& spec : spec.blocks)
-            m_blockSet.AddBlockSorted(BlockOf(spec));
-        for (const auto& stretches : spec.links) {
+        for (const CBlockFields& fields : fields.blocks)
+            m_blockSet.AddBlockSorted(BlockOf(fields));
+        for (const auto& stretches : fields.links) {
             auto link = std::make_unique<CLink>(0);
-            for (const CStretchSpec& stretch : stretches) {
+            for (const CStretchFields& stretch : stretches) {
                 link->AddMolecule(stretch.molecule, stretch.position, stretch.length, 0);
                 link->SetColumn(std::max(link->Column(), stretch.position));
             }
@@ -116,14 +117,14 @@ class CRawProject : public CSerializable {
     }
 
   private:
-    static std::unique_ptr<CSimBlock> BlockOf(const CBlockSpec& spec) {
+    static std::unique_ptr<CSimBlock> BlockOf(const CBlockFields& fields) {
         auto block = std::make_unique<CSimBlock>();
-        block->Init(spec.members, spec.starts, spec.width, 10, 0);
-        for (std::size_t i = 0; i < spec.currentStarts.size(); ++i)
-            block->SetCurrentStart(static_cast<int>(i), spec.currentStarts[i]);
-        if (spec.currentWidth)
-            block->SetCurrentWidth(*spec.currentWidth);
-        for (int excluded : spec.excluded)
+        block->Init(fields.members, fields.starts, fields.width, 10, 0);
+        for (std::size_t i = 0; i < fields.currentStarts.size(); ++i)
+            block->SetCurrentStart(static_cast<int>(i), fields.currentStarts[i]);
+        if (fields.currentWidth)
+            block->SetCurrentWidth(*fields.currentWidth);
+        for (int excluded : fields.excluded)
             block->SetIncluded(excluded, false);
         return block;
     }
@@ -134,31 +135,31 @@ class CRawProject : public CSerializable {
     CRawLinkList m_links;
 };
 
-std::vector<std::uint8_t> BytesOf(const CProjectSpec& spec) {
+std::vector<std::uint8_t> BytesOf(const CProjectFields& fields) {
     CArchive ar = CArchive::ForWriting();
     std::string tag = CBlockProject::kFileTag;
     ar.XMember(tag);
-    auto raw = std::make_unique<CRawProject>(spec);
+    auto raw = std::make_unique<CRawProject>(fields);
     ar.XPointer(raw);
     return ar.Bytes();
 }
 
 // Three molecules, their entries, one block over alpha and beta and a link holding it.
-CProjectSpec Sound() {
-    CProjectSpec spec;
-    spec.molecules = {{"alpha", "A1", "mkvlaatwwghdeklmnpqrst"},
-                      {"beta", "B2", "atwwghpqrstvv"},
-                      {"gamma", "C3", "ggmkvlaatwwghde"}};
-    spec.entries = spec.molecules;
-    spec.blocks = {{{0, 1}, {5, 0}, 6}};
-    spec.links = {{{0, 5, 6}, {1, 0, 6}}};
-    return spec;
+CProjectFields Sound() {
+    CProjectFields fields;
+    fields.molecules = {{"alpha", "A1", "mkvlaatwwghdeklmnpqrst"},
+                        {"beta", "B2", "atwwghpqrstvv"},
+                        {"gamma", "C3", "ggmkvlaatwwghde"}};
+    fields.entries = fields.molecules;
+    fields.blocks = {{{0, 1}, {5, 0}, 6}};
+    fields.links = {{{0, 5, 6}, {1, 0, 6}}};
+    return fields;
 }
 
 // The reason a project is refused, or "" when it loads.
-std::string Refusal(const CProjectSpec& spec) {
+std::string Refusal(const CProjectFields& fields) {
     try {
-        return CBlockProject::FromBytes(BytesOf(spec)) ? "" : "not a project";
+        return CBlockProject::FromBytes(BytesOf(fields)) ? "" : "not a project";
     } catch (const CArchiveException& e) {
         return e.what();
     }
@@ -178,19 +179,19 @@ TEST(ProjectValidation, TheSoundProjectLoadsAndSavesTheSameBytes) {
 }
 
 TEST(ProjectValidation, BlocksOutsideTheirMoleculesAreRefused) {
-    CProjectSpec empty = Sound();
+    CProjectFields empty = Sound();
     empty.molecules[2].sequence = empty.entries[2].sequence = "";
     empty.blocks.push_back({{0, 2}, {0, 0}, 3});
     EXPECT_THAT(Refusal(empty), Mentions("block 2 reaches past the end of \"gamma\" (0 residues)"));
 
-    CProjectSpec tooShort = Sound();
+    CProjectFields tooShort = Sound();
     tooShort.blocks[0].starts = {5, 8};  // beta has 13 residues: 8 + 6 > 13
     EXPECT_THAT(Refusal(tooShort), Mentions("reaches past the end of \"beta\" (13 residues)"));
     tooShort.blocks[0].starts = {5, 7};  // ends on beta's last residue
     tooShort.links.clear();
     EXPECT_EQ(Refusal(tooShort), "");
 
-    CProjectSpec current = Sound();
+    CProjectFields current = Sound();
     current.blocks[0].currentStarts = {5, 10};
     EXPECT_THAT(Refusal(current), Mentions("past the end of \"beta\""));
     // A member the current layout leaves out may stand anywhere in range.
@@ -201,7 +202,7 @@ TEST(ProjectValidation, BlocksOutsideTheirMoleculesAreRefused) {
 }
 
 TEST(ProjectValidation, BlockMembersAndWidthsMustMakeSense) {
-    const std::vector<std::pair<CBlockSpec, std::string>> cases = {
+    const std::vector<std::pair<CBlockFields, std::string>> cases = {
         {{{0, 3}, {0, 0}, 4}, "names a molecule entry the project does not hold"},
         {{{-1, 0}, {0, 0}, 4}, "names a molecule entry the project does not hold"},
         {{{1, 1}, {0, 2}, 4}, "holds \"beta\" twice"},
@@ -211,26 +212,26 @@ TEST(ProjectValidation, BlockMembersAndWidthsMustMakeSense) {
         {{{}, {}, 4}, "has no members"},
     };
     for (const auto& [block, message] : cases) {
-        CProjectSpec spec = Sound();
-        spec.blocks.push_back(block);
-        EXPECT_THAT(Refusal(spec), Mentions(message)) << message;
+        CProjectFields fields = Sound();
+        fields.blocks.push_back(block);
+        EXPECT_THAT(Refusal(fields), Mentions(message)) << message;
     }
 }
 
 TEST(ProjectValidation, LinksMustNameShownMoleculesWithinTheirResidues) {
-    CProjectSpec unknown = Sound();
+    CProjectFields unknown = Sound();
     unknown.links = {{{0, 0, 3}, {5, 0, 3}}};
     EXPECT_THAT(Refusal(unknown), Mentions("link 1 names a molecule the project does not hold"));
 
     // An entry whose molecule is not in the project: blocks may keep it, links may not.
-    CProjectSpec orphan = Sound();
+    CProjectFields orphan = Sound();
     orphan.entries.push_back({"delta", "D4", "mkvlaa"});
     orphan.blocks.push_back({{0, 3}, {0, 0}, 4});
     EXPECT_EQ(Refusal(orphan), "");
     orphan.links.push_back({{0, 14, 3}, {3, 0, 3}});
     EXPECT_THAT(Refusal(orphan), Mentions("link 2 names a molecule the project does not hold"));
 
-    CProjectSpec pastEnd = Sound();
+    CProjectFields pastEnd = Sound();
     pastEnd.links = {{{0, 20, 3}, {2, 12, 3}}};  // alpha has 22 residues
     EXPECT_THAT(Refusal(pastEnd), Mentions("link 1 reaches past the end of \"alpha\""));
     pastEnd.links = {{{0, 19, 3}, {2, 12, 3}}};
@@ -238,47 +239,47 @@ TEST(ProjectValidation, LinksMustNameShownMoleculesWithinTheirResidues) {
 }
 
 TEST(ProjectValidation, MoleculesAndEntriesMustBeTellableApart) {
-    const std::vector<std::pair<std::function<void(CProjectSpec&)>, std::string>> cases = {
-        {[](CProjectSpec& spec) { spec.molecules[2].name = "alpha"; },
+    const std::vector<std::pair<std::function<void(CProjectFields&)>, std::string>> cases = {
+        {[](CProjectFields& fields) { fields.molecules[2].name = "alpha"; },
          "two molecules are named \"alpha\""},
-        {[](CProjectSpec& spec) { spec.molecules[1].name = ""; }, "molecule 2 has no name"},
-        {[](CProjectSpec& spec) { spec.molecules[2].key = "A1"; },
+        {[](CProjectFields& fields) { fields.molecules[1].name = ""; }, "molecule 2 has no name"},
+        {[](CProjectFields& fields) { fields.molecules[2].key = "A1"; },
          "two molecules share the key A1"},
-        {[](CProjectSpec& spec) { spec.entries[2].key = "B2"; },
+        {[](CProjectFields& fields) { fields.entries[2].key = "B2"; },
          "two block entries name the molecule"},
         // The alignment shows the molecule's residues where the entry's are counted.
-        {[](CProjectSpec& spec) { spec.entries[1].sequence += "kkkk"; },
+        {[](CProjectFields& fields) { fields.entries[1].sequence += "kkkk"; },
          "the block entry of \"beta\" differs in length"},
     };
     for (const auto& [damage, message] : cases) {
-        CProjectSpec spec = Sound();
-        damage(spec);
-        EXPECT_THAT(Refusal(spec), Mentions(message)) << message;
+        CProjectFields fields = Sound();
+        damage(fields);
+        EXPECT_THAT(Refusal(fields), Mentions(message)) << message;
     }
 }
 
 TEST(ProjectValidation, ExpectationLimitsMustBePositiveNumbers) {
     for (double limit : {std::nan(""), -1.0, 0.0, std::numeric_limits<double>::infinity(),
                          -std::numeric_limits<double>::infinity()}) {
-        CProjectSpec spec = Sound();
-        spec.expectationLimit = limit;
-        EXPECT_THAT(Refusal(spec), Mentions("search values outside their limits")) << limit;
+        CProjectFields fields = Sound();
+        fields.expectationLimit = limit;
+        EXPECT_THAT(Refusal(fields), Mentions("search values outside their limits")) << limit;
 
         CQuilterParams params;
         params.SetExpectationLimit(limit);
         EXPECT_THROW(CQuilterParams().ReadTemplateBytes(params.TemplateBytes()), CArchiveException)
             << limit;
     }
-    CProjectSpec tiny = Sound();
+    CProjectFields tiny = Sound();
     tiny.expectationLimit = 1e-300;
     EXPECT_EQ(Refusal(tiny), "");
 }
 
 TEST(ProjectValidation, OpenReportsTheFileAndTheFault) {
     CScratchDir dir("tb_project_validation");
-    CProjectSpec spec = Sound();
-    spec.blocks[0].members = {0, 7};
-    const std::vector<std::uint8_t> bytes = BytesOf(spec);
+    CProjectFields fields = Sound();
+    fields.blocks[0].members = {0, 7};
+    const std::vector<std::uint8_t> bytes = BytesOf(fields);
     const std::string path = dir.Write("damaged.bpr", std::string(bytes.begin(), bytes.end()));
     CBlockProject project;
     CRecordingPrompt prompt;
@@ -309,31 +310,31 @@ TEST(ProjectValidation, AProjectThatWouldNotReadBackNeverReplacesAFile) {
 
 // Random projects, most of them damaged somewhere: each either is refused or survives the
 // commands the program runs on a project and then saves and loads again.
-CProjectSpec RandomProject(std::mt19937& random) {
+CProjectFields RandomProject(std::mt19937& random) {
     auto pick = [&](int low, int high) {
         return std::uniform_int_distribution<int>(low, high)(random);
     };
-    CProjectSpec spec;
+    CProjectFields fields;
     const int molecules = pick(1, 4);
     for (int i = 0; i < molecules; ++i) {
         std::string sequence(static_cast<std::size_t>(pick(0, 12)), 'a');
         for (char& residue : sequence)
             residue = "acdefghiklmnpqrstvwy"[pick(0, 19)];
-        spec.molecules.push_back(
+        fields.molecules.push_back(
             {"m" + std::to_string(pick(0, 5)), "K" + std::to_string(pick(0, 5)), sequence});
     }
-    for (const CMoleculeSpec& molecule : spec.molecules) {
-        CMoleculeSpec entry = molecule;
+    for (const CMoleculeFields& molecule : fields.molecules) {
+        CMoleculeFields entry = molecule;
         if (pick(0, 5) == 0)
             entry.key = "K" + std::to_string(pick(0, 5));
         if (pick(0, 5) == 0)
             entry.sequence.resize(static_cast<std::size_t>(pick(0, 12)), 'w');
         if (pick(0, 5) > 0)
-            spec.entries.push_back(entry);
+            fields.entries.push_back(entry);
     }
-    const int entries = static_cast<int>(spec.entries.size());
+    const int entries = static_cast<int>(fields.entries.size());
     for (int b = pick(0, 3); b > 0; --b) {
-        CBlockSpec block;
+        CBlockFields block;
         for (int m = pick(1, 3); m > 0; --m) {
             block.members.push_back(pick(-1, entries));
             block.starts.push_back(pick(-1, 10));
@@ -346,15 +347,15 @@ CProjectSpec RandomProject(std::mt19937& random) {
         }
         if (pick(0, 2) == 0)
             block.excluded.push_back(0);
-        spec.blocks.push_back(block);
+        fields.blocks.push_back(block);
     }
     for (int l = pick(0, 2); l > 0; --l) {
-        std::vector<CStretchSpec> link;
+        std::vector<CStretchFields> link;
         for (int k = pick(1, 3); k > 0; --k)
             link.push_back({pick(0, entries), pick(0, 10), pick(0, 5)});
-        spec.links.push_back(link);
+        fields.links.push_back(link);
     }
-    return spec;
+    return fields;
 }
 
 // Link, unlink, define a block over the first columns of every row, delete a molecule.
@@ -378,10 +379,10 @@ TEST(ProjectValidation, EveryProjectThatLoadsSavesAndLoadsAgain) {
     std::mt19937 random(20261207);
     int loaded = 0;
     for (int trial = 0; trial < 3000; ++trial) {
-        const CProjectSpec spec = RandomProject(random);
+        const CProjectFields fields = RandomProject(random);
         std::unique_ptr<CBlockProject> project;
         try {
-            project = CBlockProject::FromBytes(BytesOf(spec));
+            project = CBlockProject::FromBytes(BytesOf(fields));
         } catch (const CArchiveException&) {
             continue;
         }

@@ -88,10 +88,10 @@ class FigureExportTest : public ::testing::Test {
         CBlockProject project = ProjectWith(scratch, kFasta);
         InstallBlocks(project, {{{0, 1}, {5, 0}, 6, 45}, {{0, 1}, {17, 6}, 5, 30}});
         CRecordingPrompt prompt;
-        ASSERT_TRUE(project.Link(std::vector<ALN_BSEL_ENTRY>{{"alpha", 5, 11}, {"beta", 0, 6}},
-                                 prompt));
-        ASSERT_TRUE(project.Link(
-            std::vector<ALN_BSEL_ENTRY>{{"alpha", 17, 22}, {"beta", 11, 16}}, prompt));
+        ASSERT_TRUE(
+            project.Link(std::vector<ALN_BSEL_ENTRY>{{"alpha", 5, 11}, {"beta", 0, 6}}, prompt));
+        ASSERT_TRUE(
+            project.Link(std::vector<ALN_BSEL_ENTRY>{{"alpha", 17, 22}, {"beta", 11, 16}}, prompt));
         projectPath = Path("linked.bpr");
         project.Save(projectPath.toStdString());
     }
@@ -190,17 +190,15 @@ TEST_F(FigureExportTest, PngHasTheAskedWidthAndPdfOpensWithOnePage) {
     EXPECT_EQ(image.width(), 777);
     // The height keeps the pane's proportions.
     const CShownPane shown(projectPath);
-    const QSize natural =
-        shown.Rows().ContentSize(0, shown.Rows().ColumnCount(), 0, shown.Rows().PrintRowCount(),
-                                 {});
+    const QSize natural = shown.Rows().ContentSize(0, shown.Rows().ColumnCount(), 0,
+                                                   shown.Rows().PrintRowCount(), {});
     EXPECT_NEAR(image.height(), 777.0 * natural.height() / natural.width(), 1.0);
     EXPECT_EQ(PdfPageCount(pdf), 1);
 
     // Without --width the image is the pane's own size; a column range narrows it.
     ASSERT_EQ(Export({"--export", "alignment=" + png, projectPath}), kFigureDone);
     EXPECT_EQ(QImage(png).size(), natural);
-    ASSERT_EQ(Export({"--columns", "3-12", "--export=alignment=" + png, projectPath}),
-              kFigureDone);
+    ASSERT_EQ(Export({"--columns", "3-12", "--export=alignment=" + png, projectPath}), kFigureDone);
     EXPECT_EQ(QImage(png).width(),
               shown.Rows().ContentSize(2, 12, 0, shown.Rows().PrintRowCount(), {}).width());
 }
@@ -212,17 +210,17 @@ TEST_F(FigureExportTest, BadUsageAndUnreadableInputGiveStatusTwo) {
     text.write(">alpha\nMKV\n");
     text.close();
     const std::vector<QStringList> cases = {
-        {"--export", "alignment=" + svg, Path("missing.bpr")},            // no such file
-        {"--export", "alignment=" + svg, Path("notes.txt")},              // not a project
-        {"--export", "histogram=" + svg, projectPath},                    // unknown view
-        {"--export", "alignment=" + Path("out.gif"), projectPath},        // unknown extension
-        {"--export", "alignment", projectPath},                           // no file
-        {"--export", "alignment=" + svg},                                 // no project
-        {"--export", "alignment=" + svg, "--width", "-4", projectPath},   // bad width
-        {"--export", "alignment=" + svg, "--columns", "9-3", projectPath},// reversed range
-        {"--export", "alignment=" + svg, "--columns", "x", projectPath},  // malformed range
-        {"--export", "alignment=" + svg, "--frobnicate", projectPath},    // unknown option
-        {"--export", "alignment=" + svg, projectPath, projectPath},       // two projects
+        {"--export", "alignment=" + svg, Path("missing.bpr")},              // no such file
+        {"--export", "alignment=" + svg, Path("notes.txt")},                // not a project
+        {"--export", "histogram=" + svg, projectPath},                      // unknown view
+        {"--export", "alignment=" + Path("out.gif"), projectPath},          // unknown extension
+        {"--export", "alignment", projectPath},                             // no file
+        {"--export", "alignment=" + svg},                                   // no project
+        {"--export", "alignment=" + svg, "--width", "-4", projectPath},     // bad width
+        {"--export", "alignment=" + svg, "--columns", "9-3", projectPath},  // reversed range
+        {"--export", "alignment=" + svg, "--columns", "x", projectPath},    // malformed range
+        {"--export", "alignment=" + svg, "--frobnicate", projectPath},      // unknown option
+        {"--export", "alignment=" + svg, projectPath, projectPath},         // two projects
         {"--export", "alignment=" + Path("no/such/folder/out.svg"), projectPath},  // unwritable
     };
     for (const QStringList& arguments : cases) {
@@ -256,8 +254,8 @@ TEST_F(FigureExportTest, NothingToDrawGivesStatusOneAndLeavesOldFiles) {
                       "alignment=" + Path("no/such/folder/out.png"), projectPath}),
               kFigureFailed);
     EXPECT_TRUE(QFile::exists(svg));
-    EXPECT_EQ(Export({"--export", "alignment=" + svg, "--export", "alignment=" + png,
-                      "--columns", "20-30", projectPath}),
+    EXPECT_EQ(Export({"--export", "alignment=" + svg, "--export", "alignment=" + png, "--columns",
+                      "20-30", projectPath}),
               kFigureDone);
     EXPECT_NE(QImage(png).width(), 0);
 }

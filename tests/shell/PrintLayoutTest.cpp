@@ -35,8 +35,7 @@ TEST(HeaderFooter, PlacementCodesTakeTheTextBeforeThem) {
     const CPageTextContext context = Context(QStringLiteral("/data/kinases.bpr"), 3, 12);
     const QString date = QLocale().toString(QDate(2024, 3, 9), QLocale::ShortFormat);
     // The defaults: the date centred; the file name and page at the left.
-    EXPECT_EQ(ExpandHeaderFooter(QStringLiteral("&D&c"), context),
-              (CPageTextParts{{}, date, {}}));
+    EXPECT_EQ(ExpandHeaderFooter(QStringLiteral("&D&c"), context), (CPageTextParts{{}, date, {}}));
     EXPECT_EQ(ExpandHeaderFooter(QStringLiteral("&s Page &p&l"), context),
               (CPageTextParts{QStringLiteral("kinases.bpr Page 3"), {}, {}}));
     // All three places; text after the last code goes to the left.
@@ -82,7 +81,8 @@ TEST(PageBands, HeaderAndFooterTakeTenMillimetresEachOnlyWithText) {
     EXPECT_FALSE(plain->header);
     EXPECT_FALSE(plain->footer);
 
-    const auto both = PageBands(kA4, MarginSetup(20, QStringLiteral("&D&c"), QStringLiteral("&p&r")));
+    const auto both =
+        PageBands(kA4, MarginSetup(20, QStringLiteral("&D&c"), QStringLiteral("&p&r")));
     ASSERT_TRUE(both);
     EXPECT_EQ(*both->header, (CRectMm{20, 20, 170, 10}));
     EXPECT_EQ(both->body, (CRectMm{20, 30, 170, 237}));
@@ -90,9 +90,9 @@ TEST(PageBands, HeaderAndFooterTakeTenMillimetresEachOnlyWithText) {
 }
 
 TEST(PageBands, MarginsThatLeaveNoRoomGiveNoPage) {
-    EXPECT_FALSE(PageBands(kA4, MarginSetup(105)));   // the width is used up exactly
-    EXPECT_FALSE(PageBands(kA4, MarginSetup(300)));   // margins larger than the page
-    EXPECT_FALSE(PageBands(kA4, MarginSetup(-1)));    // negative margins
+    EXPECT_FALSE(PageBands(kA4, MarginSetup(105)));  // the width is used up exactly
+    EXPECT_FALSE(PageBands(kA4, MarginSetup(300)));  // margins larger than the page
+    EXPECT_FALSE(PageBands(kA4, MarginSetup(-1)));   // negative margins
     // Left and right fit, but the header and footer bands eat the last of the height.
     CPrintSetup tall = MarginSetup(0, QStringLiteral("h"), QStringLiteral("f"));
     tall.margins.top = tall.margins.bottom = 138.5;
@@ -102,8 +102,9 @@ TEST(PageBands, MarginsThatLeaveNoRoomGiveNoPage) {
 }
 
 TEST(PrintPlan, StretchesShareAPageWhenTheyFit) {
-    // Body 170 x 237 mm. Names of 27 mm leave 143 mm: 57 columns of 2.5 mm (57 x 2.5 = 142.5). 1000 columns make 18 stretches (17 x 57 = 969, the last has 31).
-    // A stretch of 10 rows x 4 mm = 40 mm plus the 5 mm gap: 5 per page (225 mm), so 4 pages.
+    // Body 170 x 237 mm. Names of 27 mm leave 143 mm: 57 columns of 2.5 mm (57 x 2.5 = 142.5). 1000
+    // columns make 18 stretches (17 x 57 = 969, the last has 31). A stretch of 10 rows x 4 mm = 40
+    // mm plus the 5 mm gap: 5 per page (225 mm), so 4 pages.
     const CPrintPlan plan = PlanPrint(Rows(27, 2.5, 1000, 10, 4), 170, 237);
     EXPECT_EQ(plan.columnsPerStretch, 57);
     EXPECT_EQ(plan.stretchCount, 18);

@@ -6,9 +6,9 @@
 #include <QPrintPreviewDialog>
 #include <QPrintPreviewWidget>
 #include <QPrinter>
-#include <QTimer>
 #include <QSettings>
 #include <QTemporaryDir>
+#include <QTimer>
 
 #include "AlignmentPane.h"
 #include "BlockProject.h"
@@ -26,8 +26,7 @@
 
 namespace {
 
-const QString kGlobins =
-    QStringLiteral(TB_TEST_DATA_DIR "/../../resources/examples/globins.fa");
+const QString kGlobins = QStringLiteral(TB_TEST_DATA_DIR "/../../resources/examples/globins.fa");
 
 // The globins searched, with the first block linked.
 std::unique_ptr<CBlockProject> LinkedGlobins() {
@@ -78,8 +77,8 @@ TEST(PrintPane, GlobinsPrintTheirPredictedPages) {
         const CRowsPrinter pages(rows, setup, {QDateTime::currentDateTime(), path});
 
         // The plan from the page alone: A4 less 19.05 mm at the sides, 12.7 mm above and below.
-        const QSizeF page = orientation == QPageLayout::Portrait ? QSizeF(210, 297)
-                                                                  : QSizeF(297, 210);
+        const QSizeF page =
+            orientation == QPageLayout::Portrait ? QSizeF(210, 297) : QSizeF(297, 210);
         const auto bands = PageBands(page, setup);
         ASSERT_TRUE(bands);
         EXPECT_NEAR(bands->body.width, page.width() - 38.1, 1e-9);
@@ -169,11 +168,11 @@ TEST_F(PrintCommandTest, PreviewShowsThePlannedPages) {
     Settle();
     // What the preview's printer will be asked to print, counted beforehand.
     const CPageSetup page = app->Settings().LoadPageSetup();
-    const CRowsPrinter pages(*app->MainFrame()->Pane(kAlnPane)->PrintableRows(),
-                             PrintSetupFromStored(page.marginL, page.marginR, page.marginT,
-                                                  page.marginB, page.isMetric != 0, page.header,
-                                                  page.footer),
-                             {});
+    const CRowsPrinter pages(
+        *app->MainFrame()->Pane(kAlnPane)->PrintableRows(),
+        PrintSetupFromStored(page.marginL, page.marginR, page.marginT, page.marginB,
+                             page.isMetric != 0, page.header, page.footer),
+        {});
     QString error;
     const int expected = pages.PageCount(app->Printer(), error);
     ASSERT_GT(expected, 0) << error.toStdString();

@@ -38,8 +38,8 @@ class CFakeRows : public IPrintableRows {
                       const CRowPrintOptions&) const override {
         return {kLeft + (endColumn - firstColumn) * kColumn, (endRow - firstRow) * kRowHeight};
     }
-    void PaintRange(QPainter& painter, QPoint origin, int firstColumn, int endColumn,
-                    int firstRow, int endRow, const CRowPrintOptions& options) const override {
+    void PaintRange(QPainter& painter, QPoint origin, int firstColumn, int endColumn, int firstRow,
+                    int endRow, const CRowPrintOptions& options) const override {
         EXPECT_TRUE(options.printing);
         painted.insert({firstColumn, endColumn, firstRow, endRow});
         for (int row = firstRow; row < endRow; ++row) {
@@ -73,7 +73,7 @@ CPrintSetup A4Setup(double margin) {
 }
 
 CPageTextContext Context() {
-    return {QDateTime::currentDateTime(), QStringLiteral("/tmp/example.bpr")};
+    return {QDateTime::currentDateTime(), QStringLiteral("projects/example.bpr")};
 }
 
 struct PdfPrinter {

@@ -113,8 +113,9 @@ bool ParseFigureCommand(const QStringList& arguments, CFigureCommand& command, Q
             }
         } else if (TakeValue(arguments, i, QStringLiteral("--columns"), value)) {
             if (!ParseColumns(value, command.options)) {
-                error = QStringLiteral("--columns needs FIRST-LAST (1-based, FIRST <= LAST), "
-                                       "not \"%1\".")
+                error = QStringLiteral(
+                            "--columns needs FIRST-LAST (1-based, FIRST <= LAST), "
+                            "not \"%1\".")
                             .arg(value);
                 return false;
             }
@@ -124,8 +125,8 @@ bool ParseFigureCommand(const QStringList& arguments, CFigureCommand& command, Q
         } else if (command.project.isEmpty()) {
             command.project = arguments[i];
         } else {
-            error = QStringLiteral("One project at a time: \"%1\" is one too many.")
-                        .arg(arguments[i]);
+            error =
+                QStringLiteral("One project at a time: \"%1\" is one too many.").arg(arguments[i]);
             return false;
         }
     }
